@@ -1,0 +1,14 @@
+#!/usr/bin/env bash
+# Installs what is missing, builds, lays out the simulated host's demo world in
+# build/demo-world.db, and registers a new Kiro provider through hyracli.
+set -euo pipefail
+cd "$(dirname "$0")/.."
+scripts/install-deps.sh
+cmake --preset default >/dev/null
+cmake --build --preset default -j "$(nproc)"
+export HYRA_SIM_DB="$PWD/build/demo-world.db"
+build/bin/hyrasim init --demo
+set -x
+build/bin/hyracli storage internal tarn kiroprovider add \
+  --vp-name vp3 --vp-url https://vp3.example.test:8443/kiro \
+  --arrayid array-c --priority 2 --isactive false
