@@ -1,0 +1,46 @@
+#include "CGAdd.h"
+
+#include "CommandSpecs.h"
+#include "ParameterNames.h"
+#include "TarnLib/TarnLib.h"
+#include "TarnLibBracket.h"
+
+namespace HalvikCli {
+namespace TarnNamespace {
+
+using Fendle::CallSpec::ParameterType;
+
+namespace {
+
+constexpr char kDescription[] = "Add the TarnIds to Consistency Group";
+constexpr char kSource[] = "internal/CGAdd";
+constexpr int kInitLine = 35;
+
+}  // namespace
+
+boost::shared_ptr<CGAdd> CGAdd::New() { return boost::shared_ptr<CGAdd>(new CGAdd()); }
+
+CGAdd::CGAdd() {
+  SetDescription(kDescription);
+  SetMetaDataField(kTypeField, kOperationKind);
+  OpenTarnLib(kSource, kInitLine);
+}
+
+CGAdd::~CGAdd() { TarnLib_Exit(); }
+
+boost::shared_ptr<Fendle::CallSpec::InputSpec> CGAdd::GetInputSpecInternal() {
+  return DeclareParameters({
+      {kCgId, "c", ParameterType::String, kRequired,
+       "Consistency Group ID to which tarns are to be added"},
+      {kTarnIds, "v", ParameterType::StringList, kRequired, "List of TarnIDs."},
+      {kVpName, "n", ParameterType::String, kRequired,
+       "Name of the VP which the Hyra is registered to."},
+  });
+}
+
+boost::shared_ptr<Fendle::CallSpec::OutputSpec> CGAdd::GetOutputSpecInternal() {
+  return DeclareResult(Fendle::MetaObj::MetaBool::New());
+}
+
+}  // namespace TarnNamespace
+}  // namespace HalvikCli

@@ -1,0 +1,55 @@
+#include "CGCreate.h"
+
+#include "CommandSpecs.h"
+#include "ParameterNames.h"
+#include "TarnLib/TarnLib.h"
+#include "TarnLibBracket.h"
+
+namespace HalvikCli {
+namespace TarnNamespace {
+
+using Fendle::CallSpec::ParameterType;
+
+namespace {
+
+constexpr char kDescription[] = "Create a Consistency Group.";
+constexpr char kSource[] = "internal/CGCreate";
+constexpr int kInitLine = 47;
+
+}  // namespace
+
+boost::shared_ptr<CGCreate> CGCreate::New() { return boost::shared_ptr<CGCreate>(new CGCreate()); }
+
+CGCreate::CGCreate() {
+  SetDescription(kDescription);
+  SetDefaultOutputFormatter(kTableFormatter);
+  SetDefaultOutputParameter(
+      "fields:CGCreate",
+      "Name,Description,Id,DestinationArrayId,FailoverArrayId,SourceArrayId,State");
+  SetMetaDataField(kTypeField, kOperationKind);
+  OpenTarnLib(kSource, kInitLine);
+}
+
+CGCreate::~CGCreate() { TarnLib_Exit(); }
+
+boost::shared_ptr<Fendle::CallSpec::InputSpec> CGCreate::GetInputSpecInternal() {
+  return DeclareParameters({
+      {kName, "n", ParameterType::String, kRequired, "Consistency Group Name"},
+      {kDesc, "d", ParameterType::String, kRequired, "Consistency Group Description"},
+      {kProfile, "p", ParameterType::String, kRequired, "Profile ID as advertised by VP"},
+      {kVpName, "v", ParameterType::String, kRequired,
+       "Name of the VP which Hyra host is registered to"},
+  });
+}
+
+boost::shared_ptr<Fendle::CallSpec::OutputSpec> CGCreate::GetOutputSpecInternal() {
+  return DeclareResult(GetOutputStructure());
+}
+
+boost::shared_ptr<Fendle::MetaObj::MetaStruct> CGCreate::GetOutputStructure() {
+  return NewTextStruct("CGCreate", {"Name", "Description", "Id", "DestinationArrayId",
+                                    "FailoverArrayId", "SourceArrayId", "State"});
+}
+
+}  // namespace TarnNamespace
+}  // namespace HalvikCli

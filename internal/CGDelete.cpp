@@ -1,0 +1,44 @@
+#include "CGDelete.h"
+
+#include "CommandSpecs.h"
+#include "ParameterNames.h"
+#include "TarnLib/TarnLib.h"
+#include "TarnLibBracket.h"
+
+namespace HalvikCli {
+namespace TarnNamespace {
+
+using Fendle::CallSpec::ParameterType;
+
+namespace {
+
+constexpr char kDescription[] = "Delete the Consistency Group";
+constexpr char kSource[] = "internal/CGDelete";
+constexpr int kInitLine = 37;
+
+}  // namespace
+
+boost::shared_ptr<CGDelete> CGDelete::New() { return boost::shared_ptr<CGDelete>(new CGDelete()); }
+
+CGDelete::CGDelete() {
+  SetDescription(kDescription);
+  SetDefaultOutputFormatter(kSimpleFormatter);
+  SetMetaDataField(kTypeField, kOperationKind);
+  OpenTarnLib(kSource, kInitLine);
+}
+
+CGDelete::~CGDelete() { TarnLib_Exit(); }
+
+boost::shared_ptr<Fendle::CallSpec::InputSpec> CGDelete::GetInputSpecInternal() {
+  return DeclareParameters({
+      {kCgId, "c", ParameterType::String, kRequired, "ID of Consistency Group to be deleted"},
+      {kVpName, "v", ParameterType::String, kRequired, "Name of the VP"},
+  });
+}
+
+boost::shared_ptr<Fendle::CallSpec::OutputSpec> CGDelete::GetOutputSpecInternal() {
+  return DeclareResult(Fendle::MetaObj::MetaBool::New());
+}
+
+}  // namespace TarnNamespace
+}  // namespace HalvikCli

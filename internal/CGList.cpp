@@ -1,0 +1,43 @@
+#include "CGList.h"
+
+#include "CommandSpecs.h"
+#include "SharedParameters.h"
+
+namespace HalvikCli {
+namespace TarnNamespace {
+
+using Fendle::MetaObj::MetaList;
+using Fendle::MetaObj::MetaType;
+
+namespace {
+
+constexpr char kDescription[] = "List Consistency Group IDs.";
+
+}  // namespace
+
+boost::shared_ptr<CGList> CGList::New() { return boost::shared_ptr<CGList>(new CGList()); }
+
+CGList::CGList() {
+  SetDescription(kDescription);
+  SetDefaultOutputFormatter(kTableFormatter);
+  SetDefaultOutputParameter("fields:CGList",
+                            "CgId,Name,Description,DestinationArrayId,FailOverArrayId,"
+                            "SourceArrayId,State,Warning,Error");
+  SetMetaDataField(kTypeField, kFetcherKind);
+}
+
+boost::shared_ptr<Fendle::CallSpec::InputSpec> CGList::GetInputSpecInternal() {
+  return DeclareCgListParameters("Name of the VP which Hyra is registered.");
+}
+
+boost::shared_ptr<Fendle::CallSpec::OutputSpec> CGList::GetOutputSpecInternal() {
+  return DeclareResult(MetaList::New(MetaType::Struct, GetOutputStructure()));
+}
+
+boost::shared_ptr<Fendle::MetaObj::MetaStruct> CGList::GetOutputStructure() {
+  return NewTextStruct("CGList", {"CgId", "Name", "Description", "DestinationArrayId",
+                                  "FailOverArrayId", "SourceArrayId", "State", "Warning", "Error"});
+}
+
+}  // namespace TarnNamespace
+}  // namespace HalvikCli

@@ -1,0 +1,31 @@
+// Syncs consistency groups. Not hung into the tree. Holds the daemon client
+// library open for its whole life.
+#pragma once
+
+#include <boost/shared_ptr.hpp>
+
+#include "Fendle/AutoCli.h"
+
+namespace HalvikCli {
+namespace TarnNamespace {
+
+class CGSync : public virtual Fendle::AutoCli::Command {
+ public:
+  static boost::shared_ptr<CGSync> New();
+  // Releases the daemon client library opened by the constructor.
+  ~CGSync() override;
+
+  // The prototype of one result row.
+  virtual boost::shared_ptr<Fendle::MetaObj::MetaStruct> GetOutputStructure();
+
+ protected:
+  // Opens the daemon client library as its last step; throws
+  // OskCtl::Lib::OskCtlException when it cannot.
+  CGSync();
+
+  boost::shared_ptr<Fendle::CallSpec::InputSpec> GetInputSpecInternal() override;
+  boost::shared_ptr<Fendle::CallSpec::OutputSpec> GetOutputSpecInternal() override;
+};
+
+}  // namespace TarnNamespace
+}  // namespace HalvikCli

@@ -1,0 +1,23 @@
+// `configtarn add`: creates a config-tarn in a mounted container.
+#pragma once
+
+#include <boost/shared_ptr.hpp>
+
+#include "Fendle/AutoCli.h"
+
+namespace HalvikCli {
+namespace TarnNamespace {
+
+class ConfigTarnAdd : public virtual Fendle::AutoCli::Command {
+ public:
+  static boost::shared_ptr<ConfigTarnAdd> New();
+
+ protected:
+  ConfigTarnAdd();
+
+  boost::shared_ptr<Fendle::CallSpec::InputSpec> GetInputSpecInternal() override;
+  boost::shared_ptr<Fendle::CallSpec::OutputSpec> GetOutputSpecInternal() override;
+};
+
+}  // namespace TarnNamespace
+}  // namespace HalvikCli

@@ -1,0 +1,33 @@
+#include "ConfigTarnRemove.h"
+
+#include "CommandSpecs.h"
+#include "SharedParameters.h"
+
+namespace HalvikCli {
+namespace TarnNamespace {
+
+namespace {
+
+constexpr char kDescription[] = "Unmount and delete a given config Tarn.";
+
+}  // namespace
+
+boost::shared_ptr<ConfigTarnRemove> ConfigTarnRemove::New() {
+  return boost::shared_ptr<ConfigTarnRemove>(new ConfigTarnRemove());
+}
+
+ConfigTarnRemove::ConfigTarnRemove() {
+  SetDescription(kDescription);
+  SetMetaDataField(kTypeField, kOperationKind);
+}
+
+boost::shared_ptr<Fendle::CallSpec::InputSpec> ConfigTarnRemove::GetInputSpecInternal() {
+  return DeclareConfigTarnParameters("Directory Path");
+}
+
+boost::shared_ptr<Fendle::CallSpec::OutputSpec> ConfigTarnRemove::GetOutputSpecInternal() {
+  return DeclareResult(Fendle::MetaObj::MetaBool::New());
+}
+
+}  // namespace TarnNamespace
+}  // namespace HalvikCli

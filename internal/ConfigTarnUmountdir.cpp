@@ -1,0 +1,33 @@
+#include "ConfigTarnUmountdir.h"
+
+#include "CommandSpecs.h"
+#include "SharedParameters.h"
+
+namespace HalvikCli {
+namespace TarnNamespace {
+
+namespace {
+
+constexpr char kDescription[] = "Unmount a given Config Tarn from the Hyra file system";
+
+}  // namespace
+
+boost::shared_ptr<ConfigTarnUmountdir> ConfigTarnUmountdir::New() {
+  return boost::shared_ptr<ConfigTarnUmountdir>(new ConfigTarnUmountdir());
+}
+
+ConfigTarnUmountdir::ConfigTarnUmountdir() {
+  SetDescription(kDescription);
+  SetMetaDataField(kTypeField, kOperationKind);
+}
+
+boost::shared_ptr<Fendle::CallSpec::InputSpec> ConfigTarnUmountdir::GetInputSpecInternal() {
+  return DeclareConfigTarnParameters("Directory Name");
+}
+
+boost::shared_ptr<Fendle::CallSpec::OutputSpec> ConfigTarnUmountdir::GetOutputSpecInternal() {
+  return DeclareResult(Fendle::MetaObj::MetaBool::New());
+}
+
+}  // namespace TarnNamespace
+}  // namespace HalvikCli

@@ -1,0 +1,48 @@
+#include "FaultInjectionEnable.h"
+
+#include "CommandEndings.h"
+#include "CommandSpecs.h"
+#include "ParameterNames.h"
+#include "TarnLibBracket.h"
+
+namespace HalvikCli {
+namespace TarnNamespace {
+
+using Fendle::CallSpec::ParameterType;
+
+namespace {
+
+constexpr char kDescription[] = "Enable or disable Kiro Fault Injection.";
+constexpr char kSource[] = "internal/FaultInjectionEnable";
+
+}  // namespace
+
+boost::shared_ptr<FaultInjectionEnable> FaultInjectionEnable::New() {
+  return boost::shared_ptr<FaultInjectionEnable>(new FaultInjectionEnable());
+}
+
+FaultInjectionEnable::FaultInjectionEnable() {
+  SetDescription(kDescription);
+  SetMetaDataField(kTypeField, kOperationKind);
+  SetDefaultOutputFormatter(kSimpleFormatter);
+}
+
+boost::shared_ptr<Fendle::CallSpec::InputSpec> FaultInjectionEnable::GetInputSpecInternal() {
+  return DeclareParameters({
+      {kEnabled, "e", ParameterType::Bool, kRequired, "true / false"},
+  });
+}
+
+boost::shared_ptr<Fendle::CallSpec::OutputSpec> FaultInjectionEnable::GetOutputSpecInternal() {
+  return DeclareResult(Fendle::MetaObj::MetaBool::New());
+}
+
+void FaultInjectionEnable::ExecuteInternal(
+    const boost::shared_ptr<Fendle::CallSpec::Input>& /*input*/,
+    const boost::shared_ptr<Fendle::CallSpec::Output>& output) {
+  InvocationBracket bracket(kSource, __LINE__);
+  EndWithError(output, kNotImplemented);
+}
+
+}  // namespace TarnNamespace
+}  // namespace HalvikCli

@@ -1,0 +1,52 @@
+#include "FaultInjectionRuleRemove.h"
+
+#include "CommandEndings.h"
+#include "CommandSpecs.h"
+#include "ParameterNames.h"
+#include "SharedParameters.h"
+#include "TarnLibBracket.h"
+
+namespace HalvikCli {
+namespace TarnNamespace {
+
+using Fendle::CallSpec::ParameterType;
+
+namespace {
+
+constexpr char kDescription[] = "Removes a fault injection rule.";
+constexpr char kSource[] = "internal/FaultInjectionRuleRemove";
+
+}  // namespace
+
+boost::shared_ptr<FaultInjectionRuleRemove> FaultInjectionRuleRemove::New() {
+  return boost::shared_ptr<FaultInjectionRuleRemove>(new FaultInjectionRuleRemove());
+}
+
+FaultInjectionRuleRemove::FaultInjectionRuleRemove() {
+  SetDescription(kDescription);
+  SetMetaDataField(kTypeField, kOperationKind);
+  SetDefaultOutputFormatter(kSimpleFormatter);
+}
+
+boost::shared_ptr<Fendle::CallSpec::InputSpec> FaultInjectionRuleRemove::GetInputSpecInternal() {
+  return DeclareParameters({
+      {kFault, "f", ParameterType::String, kRequired, kFaultHelp},
+      {kOperation, "o", ParameterType::String, kOptional,
+       "The Kiro op (e.g. - \"createVirtualVolume\") as listed in the Kiro 2.0 specification "
+       "-- omit this parameter to remove a 'wildcard' rule."},
+  });
+}
+
+boost::shared_ptr<Fendle::CallSpec::OutputSpec> FaultInjectionRuleRemove::GetOutputSpecInternal() {
+  return DeclareResult(Fendle::MetaObj::MetaBool::New());
+}
+
+void FaultInjectionRuleRemove::ExecuteInternal(
+    const boost::shared_ptr<Fendle::CallSpec::Input>& /*input*/,
+    const boost::shared_ptr<Fendle::CallSpec::Output>& output) {
+  InvocationBracket bracket(kSource, __LINE__);
+  EndWithError(output, kNotImplemented);
+}
+
+}  // namespace TarnNamespace
+}  // namespace HalvikCli

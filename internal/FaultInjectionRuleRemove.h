@@ -1,0 +1,25 @@
+// `faultInjection rule remove`: removes a fault injection rule of the daemon.
+#pragma once
+
+#include <boost/shared_ptr.hpp>
+
+#include "Fendle/AutoCli.h"
+
+namespace HalvikCli {
+namespace TarnNamespace {
+
+class FaultInjectionRuleRemove : public virtual Fendle::AutoCli::Command {
+ public:
+  static boost::shared_ptr<FaultInjectionRuleRemove> New();
+
+ protected:
+  FaultInjectionRuleRemove();
+
+  boost::shared_ptr<Fendle::CallSpec::InputSpec> GetInputSpecInternal() override;
+  boost::shared_ptr<Fendle::CallSpec::OutputSpec> GetOutputSpecInternal() override;
+  void ExecuteInternal(const boost::shared_ptr<Fendle::CallSpec::Input>& input,
+                       const boost::shared_ptr<Fendle::CallSpec::Output>& output) override;
+};
+
+}  // namespace TarnNamespace
+}  // namespace HalvikCli

@@ -1,0 +1,23 @@
+// `kirocontext set`: sets or clears the host's Kiro context.
+#pragma once
+
+#include <boost/shared_ptr.hpp>
+
+#include "Fendle/AutoCli.h"
+
+namespace HalvikCli {
+namespace TarnNamespace {
+
+class KiroContextSet : public virtual Fendle::AutoCli::Command {
+ public:
+  static boost::shared_ptr<KiroContextSet> New();
+
+ protected:
+  KiroContextSet();
+
+  boost::shared_ptr<Fendle::CallSpec::InputSpec> GetInputSpecInternal() override;
+  boost::shared_ptr<Fendle::CallSpec::OutputSpec> GetOutputSpecInternal() override;
+};
+
+}  // namespace TarnNamespace
+}  // namespace HalvikCli

@@ -1,0 +1,30 @@
+// `kiroprovider activate`: makes a Kiro provider the active one for an array.
+// Holds the daemon client library open for its whole life.
+#pragma once
+
+#include <boost/shared_ptr.hpp>
+
+#include "Fendle/AutoCli.h"
+
+namespace HalvikCli {
+namespace TarnNamespace {
+
+class VendorProviderActivate : public virtual Fendle::AutoCli::Command {
+ public:
+  static boost::shared_ptr<VendorProviderActivate> New();
+  // Releases the daemon client library opened by the constructor.
+  ~VendorProviderActivate() override;
+
+ protected:
+  // Opens the daemon client library as its last step; throws
+  // OskCtl::Lib::OskCtlException when it cannot.
+  VendorProviderActivate();
+
+  boost::shared_ptr<Fendle::CallSpec::InputSpec> GetInputSpecInternal() override;
+  boost::shared_ptr<Fendle::CallSpec::OutputSpec> GetOutputSpecInternal() override;
+  void ExecuteInternal(const boost::shared_ptr<Fendle::CallSpec::Input>& input,
+                       const boost::shared_ptr<Fendle::CallSpec::Output>& output) override;
+};
+
+}  // namespace TarnNamespace
+}  // namespace HalvikCli

@@ -1,0 +1,25 @@
+// `kiroprovider add`: registers a new Kiro provider and its arrays on the host.
+#pragma once
+
+#include <boost/shared_ptr.hpp>
+
+#include "Fendle/AutoCli.h"
+
+namespace HalvikCli {
+namespace TarnNamespace {
+
+class VendorProviderAdd : public virtual Fendle::AutoCli::Command {
+ public:
+  static boost::shared_ptr<VendorProviderAdd> New();
+
+ protected:
+  VendorProviderAdd();
+
+  boost::shared_ptr<Fendle::CallSpec::InputSpec> GetInputSpecInternal() override;
+  boost::shared_ptr<Fendle::CallSpec::OutputSpec> GetOutputSpecInternal() override;
+  void ExecuteInternal(const boost::shared_ptr<Fendle::CallSpec::Input>& input,
+                       const boost::shared_ptr<Fendle::CallSpec::Output>& output) override;
+};
+
+}  // namespace TarnNamespace
+}  // namespace HalvikCli

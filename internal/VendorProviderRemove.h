@@ -1,0 +1,30 @@
+// `kiroprovider remove`: unregisters a Kiro provider from the host. Holds the
+// daemon client library open for its whole life.
+#pragma once
+
+#include <boost/shared_ptr.hpp>
+
+#include "Fendle/AutoCli.h"
+
+namespace HalvikCli {
+namespace TarnNamespace {
+
+class VendorProviderRemove : public virtual Fendle::AutoCli::Command {
+ public:
+  static boost::shared_ptr<VendorProviderRemove> New();
+  // Releases the daemon client library opened by the constructor.
+  ~VendorProviderRemove() override;
+
+ protected:
+  // Opens the daemon client library as its last step; throws
+  // OskCtl::Lib::OskCtlException when it cannot.
+  VendorProviderRemove();
+
+  boost::shared_ptr<Fendle::CallSpec::InputSpec> GetInputSpecInternal() override;
+  boost::shared_ptr<Fendle::CallSpec::OutputSpec> GetOutputSpecInternal() override;
+  void ExecuteInternal(const boost::shared_ptr<Fendle::CallSpec::Input>& input,
+                       const boost::shared_ptr<Fendle::CallSpec::Output>& output) override;
+};
+
+}  // namespace TarnNamespace
+}  // namespace HalvikCli

@@ -1,0 +1,26 @@
+// `kiroprovider set`: replaces the arrays of a Kiro provider the host knows,
+// keeping its URL.
+#pragma once
+
+#include <boost/shared_ptr.hpp>
+
+#include "Fendle/AutoCli.h"
+
+namespace HalvikCli {
+namespace TarnNamespace {
+
+class VendorProviderSet : public virtual Fendle::AutoCli::Command {
+ public:
+  static boost::shared_ptr<VendorProviderSet> New();
+
+ protected:
+  VendorProviderSet();
+
+  boost::shared_ptr<Fendle::CallSpec::InputSpec> GetInputSpecInternal() override;
+  boost::shared_ptr<Fendle::CallSpec::OutputSpec> GetOutputSpecInternal() override;
+  void ExecuteInternal(const boost::shared_ptr<Fendle::CallSpec::Input>& input,
+                       const boost::shared_ptr<Fendle::CallSpec::Output>& output) override;
+};
+
+}  // namespace TarnNamespace
+}  // namespace HalvikCli

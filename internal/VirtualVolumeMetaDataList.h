@@ -1,0 +1,28 @@
+// `virtualvolume metadata list`: the metadata pairs of one volume.
+#pragma once
+
+#include <boost/shared_ptr.hpp>
+
+#include "Fendle/AutoCli.h"
+
+namespace HalvikCli {
+namespace TarnNamespace {
+
+class VirtualVolumeMetaDataList : public virtual Fendle::AutoCli::Command {
+ public:
+  static boost::shared_ptr<VirtualVolumeMetaDataList> New();
+
+  // The prototype of one result row.
+  boost::shared_ptr<Fendle::MetaObj::MetaStruct> GetOutputStructure();
+
+ protected:
+  VirtualVolumeMetaDataList();
+
+  boost::shared_ptr<Fendle::CallSpec::InputSpec> GetInputSpecInternal() override;
+  boost::shared_ptr<Fendle::CallSpec::OutputSpec> GetOutputSpecInternal() override;
+  void ExecuteInternal(const boost::shared_ptr<Fendle::CallSpec::Input>& input,
+                       const boost::shared_ptr<Fendle::CallSpec::Output>& output) override;
+};
+
+}  // namespace TarnNamespace
+}  // namespace HalvikCli
