@@ -1,0 +1,284 @@
+#include "hyracli/HyraCli.h"
+
+#include "HostCtl/Lib.h"
+#include "OskCtl/Lib.h"
+#include "fendle/ArgumentParser.h"
+#include "fendle/Formatter.h"
+#include "hyracli/PluginLoader.h"
+
+#include <boost/pointer_cast.hpp>
+
+#include <algorithm>
+#include <exception>
+#include <sstream>
+
+namespace Hyracli {
+
+using Fendle::AutoCli::Command;
+using Fendle::AutoCli::Namespace;
+using Fendle::AutoCli::NamespaceNode;
+using Fendle::AutoCli::NodeType;
+using Fendle::CommandLine::UsageError;
+
+namespace {
+
+const char kTool[] = "hyracli";
+
+// Writes text as one message: a line feed is added only where it lacks one.
+void WriteMessage(std::ostream& err, const std::string& text) {
+  err << text;
+  if (text.empty() || text.back() != '\n') err << '\n';
+}
+
+int ReportUsage(std::ostream& err, const std::string& message, const std::string& helpLine) {
+  WriteMessage(err, std::string(kTool) + ": " + message);
+  err << "Run '" << helpLine << " --help' for help.\n";
+  return kExitUsage;
+}
+
+// Reports the exception in flight that left a command; never rethrows.
+int ReportCommandException(std::ostream& err) {
+  std::string message;
+  try {
+    throw;
+  } catch (const OskCtl::Lib::OskCtlException& e) {
+    message = e.GetMessage();
+  } catch (const HostCtl::Lib::HostCtlException& e) {
+    message = e.GetMessage();
+  } catch (const std::exception& e) {
+    message = e.what();
+  } catch (...) {
+    message = "the command failed with an unknown exception";
+  }
+  WriteMessage(err, std::string(kTool) + ": " + message);
+  return kExitCommandFailed;
+}
+
+// The words a user types to reach node, starting with the tool's name.
+std::string CommandLineOf(const NamespaceNode& node) {
+  std::string path = node.GetPathString(' ');
+  return path.empty() ? std::string(kTool) : std::string(kTool) + " " + path;
+}
+
+// Children of one kind as "  name  description" lines, names aligned.
+void ListChildren(const NamespaceNode& node, NodeType type, const std::string& title,
+                  std::ostream& out) {
+  std::vector<boost::shared_ptr<NamespaceNode> > children;
+  std::size_t width = 0;
+  for (const auto& child : node.GetNamespaceNodes()) {
+    if (child->GetType() != type) continue;
+    children.push_back(child);
+    width = std::max(width, child->GetName().size());
+  }
+  if (children.empty()) return;
+  out << "\n" << title << ":\n";
+  for (const auto& child : children) {
+    // Descriptions are written exactly as declared, blanks included.
+    const std::string description = child->GetDescription();
+    out << "  " << child->GetName();
+    if (!description.empty()) {
+      out << std::string(width - child->GetName().size() + 2, ' ') << description;
+    }
+    out << "\n";
+  }
+}
+
+void ListNamespace(const NamespaceNode& node, std::ostream& out) {
+  const bool root = !node.GetParent();
+  if (root) {
+    out << "Usage: " << kTool << " [global options] <namespace> ... <command> [options]\n";
+  } else {
+    out << "Usage: " << CommandLineOf(node) << " <namespace|command> ...\n";
+  }
+  if (!node.GetDescription().empty()) out << "\n" << node.GetDescription() << "\n";
+  if (root) {
+    out << "\nGlobal options:\n"
+           "  --formatter NAME  render the result as simple, table or json\n"
+           "  --plugin-dir DIR  load the plug-ins from DIR\n"
+           "  --help            show help for the words that follow\n";
+  }
+  ListChildren(node, NodeType::Namespace, "Namespaces", out);
+  ListChildren(node, NodeType::Command, "Commands", out);
+}
+
+// Picks the formatter: the one asked for, else the command's default, else
+// "simple" (which also writes a boolean as true or false).
+std::unique_ptr<Fendle::Format::Formatter> ChooseFormatter(const std::string& asked,
+                                                            const Command& command) {
+  std::unique_ptr<Fendle::Format::Formatter> formatter = Fendle::Format::CreateFormatter(
+      asked.empty() ? command.GetDefaultOutputFormatter() : asked);
+  return formatter ? std::move(formatter) : Fendle::Format::CreateFormatter("simple");
+}
+
+int RunCommand(Command& command, const std::vector<std::string>& args,
+               const std::string& formatterName, std::ostream& out, std::ostream& err) {
+  boost::shared_ptr<Fendle::CallSpec::Output> output = Fendle::CallSpec::Output::New();
+  boost::shared_ptr<Fendle::CallSpec::OutputSpec> outputSpec;
+  try {
+    boost::shared_ptr<Fendle::CallSpec::Input> input;
+    try {
+      input = Fendle::CommandLine::ArgumentParser(command.GetInputSpec()).Parse(args);
+    } catch (const UsageError& e) {
+      return ReportUsage(err, e.what(), CommandLineOf(command));
+    }
+    outputSpec = command.GetOutputSpec();
+    command.Execute(input, output);
+  } catch (...) {
+    return ReportCommandException(err);
+  }
+
+  // An error wins over any result the command also set: nothing on standard output.
+  if (output->HasError()) {
+    for (const std::string& error : output->GetErrors()) WriteMessage(err, error);
+    return kExitCommandFailed;
+  }
+  if (!output->IsFinished()) {
+    WriteMessage(err, std::string(kTool) + ": the command ended without finishing");
+    return kExitCommandFailed;
+  }
+  if (!output->GetResult()) {
+    WriteMessage(err, std::string(kTool) + ": the command finished without a result");
+    return kExitCommandFailed;
+  }
+  // Rendered completely before anything is written, so a failure leaves no half output.
+  std::ostringstream text;
+  try {
+    ChooseFormatter(formatterName, command)
+        ->Render(output->GetResult(),
+                 Fendle::Format::FormatHints(command.GetDefaultOutputFormatParameters(),
+                                             outputSpec->GetResultType()),
+                 text);
+  } catch (...) {
+    return ReportCommandException(err);
+  }
+  out << text.str();
+  return kExitOk;
+}
+
+}  // namespace
+
+GlobalOptions ParseGlobalOptions(const std::vector<std::string>& args) {
+  GlobalOptions options;
+  bool formatterGiven = false;
+  bool directoryGiven = false;
+  std::size_t at = 0;
+  for (; at < args.size() && !args[at].empty() && args[at][0] == '-'; ++at) {
+    const std::string& word = args[at];
+    if (word == "--help") {
+      options.help = true;
+      continue;
+    }
+    const std::string::size_type equals = word.find('=');
+    const std::string name = word.substr(0, equals);
+    std::string* target = nullptr;
+    bool* given = nullptr;
+    if (name == "--formatter") {
+      target = &options.formatter;
+      given = &formatterGiven;
+    } else if (name == "--plugin-dir") {
+      target = &options.pluginDirectory;
+      given = &directoryGiven;
+    } else {
+      throw UsageError("Unknown global option '" + word + "'");
+    }
+    if (*given) throw UsageError("Option " + name + " is given more than once");
+    *given = true;
+    if (equals != std::string::npos) {
+      *target = word.substr(equals + 1);
+    } else if (at + 1 < args.size()) {
+      *target = args[++at];
+    }
+    if (target->empty()) throw UsageError("Option " + name + " needs a value");
+  }
+  if (formatterGiven && !Fendle::Format::CreateFormatter(options.formatter)) {
+    throw UsageError("Unknown formatter '" + options.formatter +
+                     "'; choose simple, table or json");
+  }
+  options.words.assign(args.begin() + static_cast<std::ptrdiff_t>(at), args.end());
+  return options;
+}
+
+boost::shared_ptr<Namespace> NewRootNamespace() {
+  boost::shared_ptr<Namespace> root = Namespace::New();
+  root->SetName(kTool);
+  root->SetDescription("Manage the Hyra host.");
+  boost::shared_ptr<Namespace> storage = Namespace::New();
+  storage->SetDescription("Storage related operations.");
+  root->RegisterNamespaceNode(storage, "storage");
+  return root;
+}
+
+int Dispatch(const GlobalOptions& options, const boost::shared_ptr<NamespaceNode>& root,
+             std::ostream& out, std::ostream& err) {
+  bool help = options.help;
+  std::vector<std::string> words;
+  for (const std::string& word : options.words) {
+    if (word == "--help") {
+      help = true;
+    } else {
+      words.push_back(word);
+    }
+  }
+  boost::shared_ptr<NamespaceNode> node = root->ResolveNode(words);
+  if (node->GetType() == NodeType::Command) {
+    boost::shared_ptr<Command> command = boost::dynamic_pointer_cast<Command>(node);
+    if (!command) {
+      WriteMessage(err, std::string(kTool) + ": '" + CommandLineOf(*node) +
+                            "' is marked as a command but cannot be run");
+      return kExitCommandFailed;
+    }
+    if (!help) return RunCommand(*command, words, options.formatter, out, err);
+    std::string text;
+    try {
+      text = command->GenerateHelpOutput();
+    } catch (...) {
+      return ReportCommandException(err);
+    }
+    out << text;
+    return kExitOk;
+  }
+  if (!words.empty()) {
+    const std::string where = CommandLineOf(*node);
+    if (words.front()[0] == '-') {
+      return ReportUsage(err, "'" + where + "' is a namespace and takes no option '" +
+                                  words.front() + "'", where);
+    }
+    return ReportUsage(err, "Unknown namespace or command '" + words.front() + "' in '" + where +
+                                "'", where);
+  }
+  ListNamespace(*node, out);
+  return kExitOk;
+}
+
+int Run(const std::vector<std::string>& args, const boost::shared_ptr<NamespaceNode>& root,
+        std::ostream& out, std::ostream& err) {
+  GlobalOptions options;
+  try {
+    options = ParseGlobalOptions(args);
+  } catch (const UsageError& e) {
+    return ReportUsage(err, e.what(), kTool);
+  }
+  return Dispatch(options, root, out, err);
+}
+
+int Main(const std::vector<std::string>& args, std::ostream& out, std::ostream& err) {
+  GlobalOptions options;
+  try {
+    options = ParseGlobalOptions(args);
+  } catch (const UsageError& e) {
+    return ReportUsage(err, e.what(), kTool);
+  }
+  // Declared before the tree so that it is destroyed after it: command objects
+  // must die while the libraries holding their code are still loaded.
+  PluginLoader loader;
+  boost::shared_ptr<Namespace> root = NewRootNamespace();
+  try {
+    loader.LoadDirectory(PluginDirectory(options.pluginDirectory), root);
+  } catch (const PluginError& e) {
+    WriteMessage(err, std::string(kTool) + ": " + e.what());
+    return kExitPlugin;
+  }
+  return Dispatch(options, root, out, err);
+}
+
+}  // namespace Hyracli
