@@ -13,6 +13,8 @@
 #include <cstdint>
 #include <stdexcept>
 #include <string>
+#include <utility>
+#include <vector>
 
 namespace HyraSim {
 
@@ -47,5 +49,9 @@ struct FailureSpec {
 // replacing an earlier arming of it. Throws WorldError for an unknown name.
 void ArmFailure(const std::string& operation, const FailureSpec& spec);
 void ClearFailures();
+// The names ArmFailure accepts.
+std::vector<std::string> ArmableOperations();
+// The armed operations in name order, with the calls still to pass and fail.
+std::vector<std::pair<std::string, FailureSpec> > ArmedFailures();
 
 }  // namespace HyraSim

@@ -1,0 +1,23 @@
+// The tables of the world database and the loading and storing of a
+// WorldState. Lists are stored with their position so that the world's order
+// survives.
+#pragma once
+
+#include "Model.h"
+
+#include <sqlite3.h>
+
+namespace HyraSim {
+
+// Answers true when the database holds a world of this layout; false when it
+// is empty. Throws WorldError for a database of another layout.
+bool HasWorld(sqlite3* db);
+// Drops whatever world tables there are and creates empty ones.
+void CreateSchema(sqlite3* db);
+
+WorldState LoadWorld(sqlite3* db);
+// Replaces the stored sections named in sections (Section bits) by the
+// corresponding parts of world.
+void SaveWorld(sqlite3* db, const WorldState& world, unsigned sections);
+
+}  // namespace HyraSim
