@@ -1,0 +1,30 @@
+// How every storage-control operation meets the simulated world: one world
+// operation per call, armed failures turned into the host's exception, and an
+// unreadable world reported the same way.
+#pragma once
+
+#include "Model.h"
+#include "Operation.h"
+
+#include <functional>
+#include <string>
+
+namespace OskCtl {
+namespace Storage {
+
+// Throws HostCtl::Lib::HostCtlException with text and a default KelmMessage.
+[[noreturn]] void ThrowHostError(const std::string& text);
+
+// Runs body as the operation. Answers false when an armed failure asks for an
+// answer of "nothing" (the caller then answers its empty value without any
+// effect); throws HostCtlException for an armed failure or a world that
+// cannot be used. The body reports refusals with ThrowHostError.
+bool RunHostOperation(const char* operation, HyraSim::Access access,
+                      const std::function<unsigned(HyraSim::WorldState&)>& body);
+
+// Counts a call of an operation that answers from what the object holds;
+// answers and throws as RunHostOperation does.
+bool CountHostCall(const char* operation);
+
+}  // namespace Storage
+}  // namespace OskCtl
