@@ -85,8 +85,10 @@ std::string Command::GenerateHelpOutput() {
   // Descriptions and help texts are written exactly as declared: some carry
   // deliberate blanks, quotes or line feeds that a reader may need to see.
   std::ostringstream help;
+  // Held here: the parameters belong to the spec, which may be made afresh per call.
+  boost::shared_ptr<CallSpec::InputSpec> spec = GetInputSpec();
   const std::vector<boost::shared_ptr<CallSpec::ParameterSpec> >& parameters =
-      GetInputSpec()->GetParameters();
+      spec->GetParameters();
   help << "Usage: " << CommandLineOf(*this) << (parameters.empty() ? "" : " [options]") << "\n";
   if (!GetDescription().empty()) help << "\n" << GetDescription() << "\n";
   help << "\n";

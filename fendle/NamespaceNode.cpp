@@ -93,8 +93,8 @@ void NamespaceNode::RegisterNamespaceNode(const boost::shared_ptr<NamespaceNode>
            "': the name is already taken");
   }
   if (node->GetParent()) {
-    Refuse("Cannot register '" + name + "' in '" + Describe(*this) + "': the node is already in '" +
-           Describe(*node->GetParent()) + "'");
+    Refuse("Cannot register '" + name + "' in '" + Describe(*this) +
+           "': the node is already registered as '" + Describe(*node) + "'");
   }
   // Hanging a node under itself or under its own descendant would make a cycle
   // that owns itself and never ends a path walk.
