@@ -3,11 +3,11 @@
 // unreadable world reported the same way.
 #pragma once
 
-#include "Model.h"
-#include "Operation.h"
-
 #include <functional>
 #include <string>
+
+#include "Model.h"
+#include "Operation.h"
 
 namespace OskCtl {
 namespace Storage {

@@ -1,10 +1,10 @@
 #include "MountedTarnFileSystem.h"
 
-#include "ContainerId.h"
-#include "HostOperation.h"
-
 #include <cstring>
 #include <random>
+
+#include "ContainerId.h"
+#include "HostOperation.h"
 
 namespace OskCtl {
 namespace Storage {
@@ -121,9 +121,9 @@ void MountedTarnFileSystem::CreateConfigTarn(const std::string& name, const std:
   if (ran) createdPath = path;
 }
 
-void MountedTarnFileSystem::ActOnConfigTarn(
-    const char* operation, const std::string& name, const std::string& uuid,
-    const std::function<void(Container&, size_t)>& act) {
+void MountedTarnFileSystem::ActOnConfigTarn(const char* operation, const std::string& name,
+                                            const std::string& uuid,
+                                            const std::function<void(Container&, size_t)>& act) {
   RunHostOperation(operation, Access::kWrite, [&](WorldState& w) {
     Container& container = DaemonContainer(w);
     if (name.empty() && uuid.empty()) ThrowHostError("Either a config-tarn name or UUID is needed");
@@ -143,7 +143,8 @@ void MountedTarnFileSystem::MountConfigTarn(const std::string& name, const std::
                                             const std::string& /*reserved*/, bool /*priority*/) {
   ActOnConfigTarn("MountConfigTarn", name, uuid, [](Container& container, size_t index) {
     HyraSim::ConfigTarn& configTarn = *container.tarns[index].configTarn;
-    if (configTarn.mounted) ThrowHostError("The config-tarn " + configTarn.name + " is already mounted");
+    if (configTarn.mounted)
+      ThrowHostError("The config-tarn " + configTarn.name + " is already mounted");
     configTarn.mounted = true;
   });
 }
@@ -152,7 +153,8 @@ void MountedTarnFileSystem::UnmountConfigTarn(const std::string& name, const std
                                               const std::string& /*reserved*/, bool /*priority*/) {
   ActOnConfigTarn("UnmountConfigTarn", name, uuid, [](Container& container, size_t index) {
     HyraSim::ConfigTarn& configTarn = *container.tarns[index].configTarn;
-    if (!configTarn.mounted) ThrowHostError("The config-tarn " + configTarn.name + " is not mounted");
+    if (!configTarn.mounted)
+      ThrowHostError("The config-tarn " + configTarn.name + " is not mounted");
     configTarn.mounted = false;
   });
 }

@@ -3,12 +3,12 @@
 // that id.
 #pragma once
 
-#include "Model.h"
-#include "OskCtl/Storage.h"
-
 #include <functional>
 #include <string>
 #include <vector>
+
+#include "Model.h"
+#include "OskCtl/Storage.h"
 
 namespace OskCtl {
 namespace Storage {

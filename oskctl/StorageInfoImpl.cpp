@@ -1,10 +1,9 @@
-#include "OskCtl/Storage.h"
+#include <algorithm>
 
 #include "ContainerId.h"
 #include "HostOperation.h"
 #include "MountedTarnFileSystem.h"
-
-#include <algorithm>
+#include "OskCtl/Storage.h"
 
 namespace OskCtl {
 namespace Storage {
@@ -105,13 +104,15 @@ void StorageInfoImpl::RemoveTarnFileSystem(const std::string& normalizedId) {
 HostCtl::Storage::TarnFileSystem* StorageInfoImpl::GetTarnFileSystemByPath(
     const std::string& path) {
   std::optional<HyraSim::Mount> found;
-  if (!RunHostOperation("GetTarnFileSystemByPath", Access::kRead, [&](WorldState& w) {
-        const std::string name = NameInPath(path);
-        if (const HyraSim::Mount* mount = name.empty() ? nullptr : w.FindMount(name)) {
-          found = *mount;
-        }
-        return 0u;
-      }) ||
+  if (!RunHostOperation("GetTarnFileSystemByPath", Access::kRead,
+                        [&](WorldState& w) {
+                          const std::string name = NameInPath(path);
+                          if (const HyraSim::Mount* mount =
+                                  name.empty() ? nullptr : w.FindMount(name)) {
+                            found = *mount;
+                          }
+                          return 0u;
+                        }) ||
       !found) {
     return nullptr;
   }
@@ -132,7 +133,8 @@ void StorageInfoImpl::GetTarnVendorProviders(
     const std::string& name, std::vector<HostCtl::Storage::VendorProviderInfo>& providers) {
   std::vector<HostCtl::Storage::VendorProviderInfo> found;
   RunHostOperation("GetTarnVendorProviders", Access::kRead, [&](WorldState& w) {
-    if (const HyraSim::Provider* provider = w.FindProvider(name)) found.push_back(ToInfo(*provider));
+    if (const HyraSim::Provider* provider = w.FindProvider(name))
+      found.push_back(ToInfo(*provider));
     return 0u;
   });
   providers.insert(providers.end(), found.begin(), found.end());
@@ -152,9 +154,9 @@ void StorageInfoImpl::UpdateTarnVendorProvider(
   });
 }
 
-void StorageInfoImpl::NotifyTarnProtocolEndpointEvent(
-    const std::string& endpoint, HostCtl::Storage::ProtocolEndPointEvent event,
-    std::vector<std::string>& containers) {
+void StorageInfoImpl::NotifyTarnProtocolEndpointEvent(const std::string& endpoint,
+                                                      HostCtl::Storage::ProtocolEndPointEvent event,
+                                                      std::vector<std::string>& containers) {
   std::vector<std::string> affected;
   RunHostOperation("NotifyTarnProtocolEndpointEvent", Access::kWrite, [&](WorldState& w) {
     if (event != HostCtl::Storage::PE_APD_START && event != HostCtl::Storage::PE_APD_END) {

@@ -1,7 +1,5 @@
 #include "Connection.h"
 
-#include "World.h"
-
 #include <fcntl.h>
 #include <pwd.h>
 #include <sys/stat.h>
@@ -12,6 +10,8 @@
 #include <cstdlib>
 #include <cstring>
 #include <thread>
+
+#include "World.h"
 
 namespace HyraSim {
 namespace {
@@ -38,7 +38,7 @@ std::string HomeDirectory() {
 
 // Creates every missing directory of path, readable by the user only.
 void MakeDirectories(const std::string& path) {
-  for (size_t slash = path.find('/', 1); ; slash = path.find('/', slash + 1)) {
+  for (size_t slash = path.find('/', 1);; slash = path.find('/', slash + 1)) {
     const std::string part = path.substr(0, slash);
     if (mkdir(part.c_str(), 0700) != 0 && errno != EEXIST) {
       throw WorldError("cannot create the directory " + part + ": " + std::strerror(errno));
@@ -101,8 +101,8 @@ class Holder {
     close(fd);
 
     sqlite3* db = nullptr;
-    const int rc = sqlite3_open_v2(path.c_str(), &db, SQLITE_OPEN_READWRITE | SQLITE_OPEN_NOMUTEX,
-                                   nullptr);
+    const int rc =
+        sqlite3_open_v2(path.c_str(), &db, SQLITE_OPEN_READWRITE | SQLITE_OPEN_NOMUTEX, nullptr);
     if (rc != SQLITE_OK) {
       const std::string text = db != nullptr ? sqlite3_errmsg(db) : sqlite3_errstr(rc);
       sqlite3_close_v2(db);
@@ -148,8 +148,8 @@ Holder& TheHolder() {
 std::string DatabasePath() {
   if (const char* path = EnvText("HYRA_SIM_DB")) return path;
   const char* state = EnvText("XDG_STATE_HOME");
-  const std::string base = state != nullptr && state[0] == '/' ? std::string(state)
-                                                               : HomeDirectory() + "/.local/state";
+  const std::string base =
+      state != nullptr && state[0] == '/' ? std::string(state) : HomeDirectory() + "/.local/state";
   return base + "/hyrasim/world.db";
 }
 

@@ -40,7 +40,8 @@ bool NormalizeContainerId(const char* text, char* out) {
 
   char normal[kContainerIdTextSize];
   size_t d = 0;
-  for (size_t i = 0; i < kHyphenatedLength; ++i) normal[i] = IsHyphenPosition(i) ? '-' : digits[d++];
+  for (size_t i = 0; i < kHyphenatedLength; ++i)
+    normal[i] = IsHyphenPosition(i) ? '-' : digits[d++];
   normal[kHyphenatedLength] = '\0';
   std::memcpy(out, normal, kContainerIdTextSize);
   return true;

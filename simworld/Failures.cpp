@@ -1,9 +1,9 @@
 #include "Failures.h"
 
-#include "Connection.h"
-
 #include <algorithm>
 #include <iterator>
+
+#include "Connection.h"
 
 namespace HyraSim {
 namespace {

@@ -3,13 +3,13 @@
 // database, so every process sees and uses the same arming.
 #pragma once
 
-#include "World.h"
-
 #include <sqlite3.h>
 
 #include <string>
 #include <utility>
 #include <vector>
+
+#include "World.h"
 
 namespace HyraSim {
 

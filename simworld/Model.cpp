@@ -1,9 +1,9 @@
 #include "Model.h"
 
-#include "ContainerId.h"
-
 #include <algorithm>
 #include <cctype>
+
+#include "ContainerId.h"
 
 namespace HyraSim {
 

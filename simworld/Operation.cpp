@@ -1,10 +1,10 @@
 #include "Operation.h"
 
+#include <stdexcept>
+
 #include "Connection.h"
 #include "Scenario.h"
 #include "Schema.h"
-
-#include <stdexcept>
 
 namespace HyraSim {
 namespace {

@@ -2,13 +2,13 @@
 // one transaction that first counts the call against an armed failure.
 #pragma once
 
-#include "Failures.h"
-#include "Model.h"
-
 #include <sqlite3.h>
 
 #include <functional>
 #include <string>
+
+#include "Failures.h"
+#include "Model.h"
 
 namespace HyraSim {
 

@@ -2,9 +2,9 @@
 // validation and written so that reading it back changes nothing.
 #pragma once
 
-#include "Model.h"
-
 #include <string>
+
+#include "Model.h"
 
 namespace HyraSim {
 

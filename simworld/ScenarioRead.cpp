@@ -1,15 +1,14 @@
-#include "ContainerId.h"
-#include "Scenario.h"
-#include "World.h"
-
-#include <nlohmann/json.hpp>
-
 #include <algorithm>
 #include <cctype>
 #include <cstdint>
 #include <iterator>
 #include <limits>
+#include <nlohmann/json.hpp>
 #include <set>
+
+#include "ContainerId.h"
+#include "Scenario.h"
+#include "World.h"
 
 namespace HyraSim {
 namespace {
@@ -128,7 +127,8 @@ class Record {
   std::vector<std::string> Texts(const char* key) {
     const Json& list = List(key);
     std::vector<std::string> texts;
-    for (size_t i = 0; i < list.size(); ++i) texts.push_back(AsText(list[i], Index(PathOf(key), i)));
+    for (size_t i = 0; i < list.size(); ++i)
+      texts.push_back(AsText(list[i], Index(PathOf(key), i)));
     return texts;
   }
 
@@ -338,8 +338,7 @@ void ReadContainers(Record& top, const std::vector<StorageArray>& arrays,
     UniqueKeys configNames("config-tarn name");
     ForEach(r, "tarns", [&](Record& t) {
       container.tarns.push_back(ReadTarn(t, configNames));
-      uuids.Add(Lower(container.tarns.back().uuid), t.PathOf("uuid"),
-                container.tarns.back().uuid);
+      uuids.Add(Lower(container.tarns.back().uuid), t.PathOf("uuid"), container.tarns.back().uuid);
     });
     containers.push_back(std::move(container));
   });

@@ -1,6 +1,6 @@
-#include "Scenario.h"
-
 #include <nlohmann/json.hpp>
+
+#include "Scenario.h"
 
 namespace HyraSim {
 namespace {
@@ -12,8 +12,10 @@ Json OrNull(const std::optional<std::string>& text) { return text ? Json(*text) 
 Json WriteDaemon(const Daemon& daemon) {
   Json rules = Json::array();
   for (const FaultRule& r : daemon.rules) {
-    rules.push_back(
-        {{"operation", r.operation}, {"fault", r.fault}, {"frequency", r.frequency}, {"time", r.time}});
+    rules.push_back({{"operation", r.operation},
+                     {"fault", r.fault},
+                     {"frequency", r.frequency},
+                     {"time", r.time}});
   }
   Json activations = Json::array();
   for (const Activation& a : daemon.activations) {
@@ -122,7 +124,8 @@ Json WriteHost(const WorldState& world) {
   for (const Provider& p : world.providers) {
     Json arrays = Json::array();
     for (const ProviderArray& a : p.arrays) {
-      arrays.push_back({{"arrayId", a.arrayId}, {"isActive", a.isActive}, {"priority", a.priority}});
+      arrays.push_back(
+          {{"arrayId", a.arrayId}, {"isActive", a.isActive}, {"priority", a.priority}});
     }
     Json provider = Json::object();
     provider["name"] = p.name;
@@ -136,7 +139,8 @@ Json WriteHost(const WorldState& world) {
   for (const Mount& m : world.mounted) {
     mounted.push_back({{"name", m.name}, {"id", m.id}, {"arrays", m.arrays}});
   }
-  return {{"providers", providers}, {"mounted", mounted}, {"kiroContext", OrNull(world.kiroContext)}};
+  return {
+      {"providers", providers}, {"mounted", mounted}, {"kiroContext", OrNull(world.kiroContext)}};
 }
 
 }  // namespace

@@ -1,9 +1,9 @@
 #include "Schema.h"
 
+#include <string>
+
 #include "Connection.h"
 #include "World.h"
-
-#include <string>
 
 namespace HyraSim {
 namespace {
@@ -50,11 +50,13 @@ CREATE TABLE failure(operation TEXT PRIMARY KEY, message TEXT, after INTEGER,
   times INTEGER, answer_null INTEGER);
 )sql";
 
-const char* const kTables[] = {
-    "layout",    "daemon",          "fault_rule", "activation",     "provider_fault",
-    "provider_fault_array",         "storage_array", "endpoint",    "endpoint_address",
-    "container", "container_array", "tarn",       "tarn_metadata",  "provider",
-    "provider_array", "mount",      "mount_array", "host",          "failure"};
+const char* const kTables[] = {"layout",        "daemon",          "fault_rule",
+                               "activation",    "provider_fault",  "provider_fault_array",
+                               "storage_array", "endpoint",        "endpoint_address",
+                               "container",     "container_array", "tarn",
+                               "tarn_metadata", "provider",        "provider_array",
+                               "mount",         "mount_array",     "host",
+                               "failure"};
 
 // The element at a stored position; a position outside the list means the
 // database was changed behind the world's back.
@@ -98,8 +100,8 @@ void LoadDaemon(sqlite3* db, Daemon& daemon) {
                         "SELECT array_id, provider, active, active_provider_url FROM activation"
                         " ORDER BY pos");
   while (activations.Step()) {
-    daemon.activations.push_back({activations.Text(0), activations.Text(1),
-                                  activations.Int(2) != 0, activations.Text(3)});
+    daemon.activations.push_back(
+        {activations.Text(0), activations.Text(1), activations.Int(2) != 0, activations.Text(3)});
   }
   Statement faults(db, "SELECT provider, url, status FROM provider_fault ORDER BY pos");
   while (faults.Step()) {
@@ -204,8 +206,7 @@ void SaveArrays(sqlite3* db, const std::vector<StorageArray>& arrays) {
 }
 
 void LoadContainers(sqlite3* db, std::vector<Container>& containers) {
-  Statement container(db,
-                      "SELECT name, id, vp_url, max_tarn_size_mb FROM container ORDER BY pos");
+  Statement container(db, "SELECT name, id, vp_url, max_tarn_size_mb FROM container ORDER BY pos");
   while (container.Step()) {
     containers.push_back(
         {container.Text(0), container.Text(1), container.Text(2), container.Int(3), {}, {}});

@@ -3,9 +3,9 @@
 // survives.
 #pragma once
 
-#include "Model.h"
-
 #include <sqlite3.h>
+
+#include "Model.h"
 
 namespace HyraSim {
 
