@@ -1,7 +1,6 @@
 #include "fendle/ArgumentParser.h"
 
 #include <boost/algorithm/string/predicate.hpp>
-
 #include <charconv>
 #include <cstdint>
 #include <set>

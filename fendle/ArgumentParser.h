@@ -9,13 +9,12 @@
 // before the command sees it.
 #pragma once
 
-#include "Fendle/CallSpec.h"
-#include "fendle/UsageError.h"
-
 #include <boost/shared_ptr.hpp>
-
 #include <string>
 #include <vector>
+
+#include "Fendle/CallSpec.h"
+#include "fendle/UsageError.h"
 
 namespace Fendle {
 namespace CommandLine {

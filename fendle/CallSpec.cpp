@@ -49,8 +49,7 @@ std::string ParameterTypeName(ParameterType type) {
 ParameterSpec::ParameterSpec(const std::string& name, ParameterType type)
     : name_(name), type_(type), required_(false) {}
 
-boost::shared_ptr<ParameterSpec> ParameterSpec::New(const std::string& name,
-                                                    ParameterType type) {
+boost::shared_ptr<ParameterSpec> ParameterSpec::New(const std::string& name, ParameterType type) {
   return boost::shared_ptr<ParameterSpec>(new ParameterSpec(name, type));
 }
 
@@ -74,7 +73,9 @@ bool ParameterSpec::IsRequired() const { return required_; }
 
 // InputSpec
 
-boost::shared_ptr<InputSpec> InputSpec::New() { return boost::shared_ptr<InputSpec>(new InputSpec()); }
+boost::shared_ptr<InputSpec> InputSpec::New() {
+  return boost::shared_ptr<InputSpec>(new InputSpec());
+}
 
 InputSpec::~InputSpec() = default;
 
@@ -154,9 +155,7 @@ std::vector<int64_t> Input::GetIntList(const std::string& name) const {
 
 bool Input::GetBool(const std::string& name) const { return LastOf(bools_, name, false); }
 
-std::vector<bool> Input::GetBoolList(const std::string& name) const {
-  return ListOf(bools_, name);
-}
+std::vector<bool> Input::GetBoolList(const std::string& name) const { return ListOf(bools_, name); }
 
 bool Input::GetFlag(const std::string& name) const { return flags_.count(name) != 0; }
 

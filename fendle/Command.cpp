@@ -1,6 +1,6 @@
-#include "Fendle/AutoCli.h"
-
 #include <sstream>
+
+#include "Fendle/AutoCli.h"
 
 namespace Fendle {
 namespace AutoCli {
@@ -125,8 +125,7 @@ boost::shared_ptr<CallSpec::OutputSpec> Command::GetOutputSpecInternal() {
 void Command::ExecuteInternal(const boost::shared_ptr<CallSpec::Input>& /*input*/,
                               const boost::shared_ptr<CallSpec::Output>& output) {
   std::string path = GetPathString(' ');
-  output->SetError("The command '" + (path.empty() ? GetName() : path) +
-                   "' is not implemented.");
+  output->SetError("The command '" + (path.empty() ? GetName() : path) + "' is not implemented.");
 }
 
 }  // namespace AutoCli

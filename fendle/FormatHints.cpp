@@ -6,8 +6,7 @@ namespace Format {
 using MetaObj::MetaObject;
 using MetaObj::MetaStruct;
 
-FormatHints::FormatHints(const Pairs& parameters,
-                         const boost::shared_ptr<MetaObject>& prototype)
+FormatHints::FormatHints(const Pairs& parameters, const boost::shared_ptr<MetaObject>& prototype)
     : parameters_(parameters), prototype_(prototype) {}
 
 std::string FormatHints::Get(const std::string& key) const {

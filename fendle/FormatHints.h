@@ -7,13 +7,12 @@
 //   "table-columns"            comma-separated columns of a table
 #pragma once
 
-#include "Fendle/MetaObj.h"
-
 #include <boost/shared_ptr.hpp>
-
 #include <string>
 #include <utility>
 #include <vector>
+
+#include "Fendle/MetaObj.h"
 
 namespace Fendle {
 namespace Format {

@@ -2,15 +2,14 @@
 // "table" (aligned columns) or "json" (for scripts).
 #pragma once
 
-#include "Fendle/MetaObj.h"
-#include "fendle/FormatHints.h"
-
 #include <boost/shared_ptr.hpp>
-
 #include <memory>
 #include <ostream>
 #include <string>
 #include <vector>
+
+#include "Fendle/MetaObj.h"
+#include "fendle/FormatHints.h"
 
 namespace Fendle {
 namespace Format {

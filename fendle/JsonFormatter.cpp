@@ -1,6 +1,6 @@
-#include "fendle/Formatter.h"
-
 #include <nlohmann/json.hpp>
+
+#include "fendle/Formatter.h"
 
 namespace Fendle {
 namespace Format {

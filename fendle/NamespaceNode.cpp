@@ -1,8 +1,7 @@
-#include "Fendle/AutoCli.h"
-
-#include "HostCtl/Lib.h"
-
 #include <algorithm>
+
+#include "Fendle/AutoCli.h"
+#include "HostCtl/Lib.h"
 
 namespace Fendle {
 namespace AutoCli {
@@ -31,9 +30,7 @@ void NamespaceNode::SetName(const std::string& name) { name_ = name; }
 
 std::string NamespaceNode::GetDescription() const { return description_; }
 
-void NamespaceNode::SetDescription(const std::string& description) {
-  description_ = description;
-}
+void NamespaceNode::SetDescription(const std::string& description) { description_ = description; }
 
 std::vector<std::string> NamespaceNode::GetPath() const {
   // The root itself has no parent and is not part of any path.
@@ -130,7 +127,9 @@ boost::shared_ptr<NamespaceNode> NamespaceNode::GetParent() const { return paren
 
 // Namespace
 
-boost::shared_ptr<Namespace> Namespace::New() { return boost::shared_ptr<Namespace>(new Namespace()); }
+boost::shared_ptr<Namespace> Namespace::New() {
+  return boost::shared_ptr<Namespace>(new Namespace());
+}
 
 NodeType Namespace::GetType() const { return NodeType::Namespace; }
 

@@ -1,6 +1,6 @@
-#include "fendle/Formatter.h"
-
 #include <algorithm>
+
+#include "fendle/Formatter.h"
 
 namespace Fendle {
 namespace Format {

@@ -1,16 +1,15 @@
 #include "hyracli/HyraCli.h"
 
+#include <algorithm>
+#include <boost/pointer_cast.hpp>
+#include <exception>
+#include <sstream>
+
 #include "HostCtl/Lib.h"
 #include "OskCtl/Lib.h"
 #include "fendle/ArgumentParser.h"
 #include "fendle/Formatter.h"
 #include "hyracli/PluginLoader.h"
-
-#include <boost/pointer_cast.hpp>
-
-#include <algorithm>
-#include <exception>
-#include <sstream>
 
 namespace Hyracli {
 
@@ -104,9 +103,9 @@ void ListNamespace(const NamespaceNode& node, std::ostream& out) {
 // Picks the formatter: the one asked for, else the command's default, else
 // "simple" (which also writes a boolean as true or false).
 std::unique_ptr<Fendle::Format::Formatter> ChooseFormatter(const std::string& asked,
-                                                            const Command& command) {
-  std::unique_ptr<Fendle::Format::Formatter> formatter = Fendle::Format::CreateFormatter(
-      asked.empty() ? command.GetDefaultOutputFormatter() : asked);
+                                                           const Command& command) {
+  std::unique_ptr<Fendle::Format::Formatter> formatter =
+      Fendle::Format::CreateFormatter(asked.empty() ? command.GetDefaultOutputFormatter() : asked);
   return formatter ? std::move(formatter) : Fendle::Format::CreateFormatter("simple");
 }
 
@@ -191,8 +190,7 @@ GlobalOptions ParseGlobalOptions(const std::vector<std::string>& args) {
     if (target->empty()) throw UsageError("Option " + name + " needs a value");
   }
   if (formatterGiven && !Fendle::Format::CreateFormatter(options.formatter)) {
-    throw UsageError("Unknown formatter '" + options.formatter +
-                     "'; choose simple, table or json");
+    throw UsageError("Unknown formatter '" + options.formatter + "'; choose simple, table or json");
   }
   options.words.assign(args.begin() + static_cast<std::ptrdiff_t>(at), args.end());
   return options;
@@ -240,11 +238,11 @@ int Dispatch(const GlobalOptions& options, const boost::shared_ptr<NamespaceNode
   if (!words.empty()) {
     const std::string where = CommandLineOf(*node);
     if (words.front()[0] == '-') {
-      return ReportUsage(err, "'" + where + "' is a namespace and takes no option '" +
-                                  words.front() + "'", where);
+      return ReportUsage(
+          err, "'" + where + "' is a namespace and takes no option '" + words.front() + "'", where);
     }
-    return ReportUsage(err, "Unknown namespace or command '" + words.front() + "' in '" + where +
-                                "'", where);
+    return ReportUsage(
+        err, "Unknown namespace or command '" + words.front() + "' in '" + where + "'", where);
   }
   ListNamespace(*node, out);
   return kExitOk;

@@ -2,13 +2,12 @@
 // help, running a command and rendering what it answers.
 #pragma once
 
-#include "Fendle/AutoCli.h"
-
 #include <boost/shared_ptr.hpp>
-
 #include <ostream>
 #include <string>
 #include <vector>
+
+#include "Fendle/AutoCli.h"
 
 namespace Hyracli {
 
@@ -22,8 +21,8 @@ enum ExitStatus : int {
 
 // The options before the command words.
 struct GlobalOptions {
-  std::string formatter;           // empty: the command's default
-  std::string pluginDirectory;     // empty: not given
+  std::string formatter;        // empty: the command's default
+  std::string pluginDirectory;  // empty: not given
   bool help = false;
   std::vector<std::string> words;  // the command words and the command's own arguments
 };
@@ -36,8 +35,9 @@ GlobalOptions ParseGlobalOptions(const std::vector<std::string>& args);
 boost::shared_ptr<Fendle::AutoCli::Namespace> NewRootNamespace();
 
 // Shows help for, or runs, what options.words name below root; answers the exit status.
-int Dispatch(const GlobalOptions& options, const boost::shared_ptr<Fendle::AutoCli::NamespaceNode>& root,
-             std::ostream& out, std::ostream& err);
+int Dispatch(const GlobalOptions& options,
+             const boost::shared_ptr<Fendle::AutoCli::NamespaceNode>& root, std::ostream& out,
+             std::ostream& err);
 
 // ParseGlobalOptions and Dispatch on a tree built by the caller; --plugin-dir
 // is accepted and not used.

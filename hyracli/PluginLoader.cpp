@@ -1,14 +1,14 @@
 #include "hyracli/PluginLoader.h"
 
-#include "HostCtl/Lib.h"
-#include "OskCtl/Lib.h"
-
 #include <dlfcn.h>
 
 #include <algorithm>
 #include <cstdlib>
 #include <filesystem>
 #include <system_error>
+
+#include "HostCtl/Lib.h"
+#include "OskCtl/Lib.h"
 
 namespace Hyracli {
 

@@ -5,14 +5,13 @@
 //       boost::shared_ptr<Fendle::AutoCli::Namespace>& root);
 #pragma once
 
-#include "Fendle/AutoCli.h"
-
 #include <boost/shared_ptr.hpp>
-
 #include <memory>
 #include <stdexcept>
 #include <string>
 #include <vector>
+
+#include "Fendle/AutoCli.h"
 
 namespace Hyracli {
 
@@ -36,7 +35,8 @@ class PluginLoader {
   // Loads every regular file named "*.plugin.so" in directory, in name order,
   // and registers each with root. Stops at the first failure with a PluginError;
   // what was loaded stays loaded.
-  void LoadDirectory(const std::string& directory, boost::shared_ptr<Fendle::AutoCli::Namespace>& root);
+  void LoadDirectory(const std::string& directory,
+                     boost::shared_ptr<Fendle::AutoCli::Namespace>& root);
   // Loads one library and calls its entry with root.
   void Load(const std::string& path, boost::shared_ptr<Fendle::AutoCli::Namespace>& root);
 

@@ -1,9 +1,9 @@
-#include "fendle/ArgumentParser.h"
-#include "TestCommand.h"
-
 #include <gtest/gtest.h>
 
 #include <functional>
+
+#include "TestCommand.h"
+#include "fendle/ArgumentParser.h"
 
 namespace {
 
@@ -74,11 +74,17 @@ TEST(ArgumentParserTest, AcceptsEveryFormOfEveryType) {
          EXPECT_FALSE(in.IsSet("count"));
        }},
       {With({"-g", "a", "--tag", "-b", "--tag=c"}),
-       [](const Input& in) { EXPECT_EQ(in.GetStringList("tag"), (Words{"a", "-b", "c"})); }},
+       [](const Input& in) {
+         EXPECT_EQ(in.GetStringList("tag"), (Words{"a", "-b", "c"}));
+       }},
       {With({"--num", "3", "--num=-2", "--num", "3"}),
-       [](const Input& in) { EXPECT_EQ(in.GetIntList("num"), (std::vector<int64_t>{3, -2, 3})); }},
+       [](const Input& in) {
+         EXPECT_EQ(in.GetIntList("num"), (std::vector<int64_t>{3, -2, 3}));
+       }},
       {With({"-b", "no", "--bits", "1"}),
-       [](const Input& in) { EXPECT_EQ(in.GetBoolList("bits"), (std::vector<bool>{false, true})); }},
+       [](const Input& in) {
+         EXPECT_EQ(in.GetBoolList("bits"), (std::vector<bool>{false, true}));
+       }},
   };
   ArgumentParser parser(EveryType());
   for (const Accepted& c : cases) {

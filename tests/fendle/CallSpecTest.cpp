@@ -1,8 +1,8 @@
+#include <gtest/gtest.h>
+
 #include "Fendle/CallSpec.h"
 #include "HostCtl/Lib.h"
 #include "TestCommand.h"
-
-#include <gtest/gtest.h>
 
 namespace {
 

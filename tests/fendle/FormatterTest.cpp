@@ -1,9 +1,9 @@
-#include "fendle/Formatter.h"
-
 #include <gtest/gtest.h>
-#include <nlohmann/json.hpp>
 
+#include <nlohmann/json.hpp>
 #include <sstream>
+
+#include "fendle/Formatter.h"
 
 namespace {
 
@@ -51,14 +51,10 @@ TEST(FormatterTest, ScalarsAndPlainListsPrintAsLinesInSimpleAndTable) {
     boost::shared_ptr<MetaObject> value;
     std::string expected;
   } cases[] = {
-      {MetaString::New("done"), "done\n"},
-      {MetaString::New("two\nlines\n"), "two\nlines\n"},
-      {MetaString::New(""), "\n"},
-      {MetaBool::New(true), "true\n"},
-      {MetaBool::New(), "false\n"},
-      {MetaInt::New(-3), "-3\n"},
-      {Strings({"a", "b"}), "a\nb\n"},
-      {Strings({}), ""},
+      {MetaString::New("done"), "done\n"},   {MetaString::New("two\nlines\n"), "two\nlines\n"},
+      {MetaString::New(""), "\n"},           {MetaBool::New(true), "true\n"},
+      {MetaBool::New(), "false\n"},          {MetaInt::New(-3), "-3\n"},
+      {Strings({"a", "b"}), "a\nb\n"},       {Strings({}), ""},
       {boost::shared_ptr<MetaObject>(), ""},
   };
   for (const char* formatter : {"simple", "table"}) {
@@ -135,7 +131,8 @@ TEST(SimpleFormatterTest, FieldsHintChoosesAndOrdersFieldsAndUnitsFollowValues) 
 
 TEST(TableFormatterTest, FieldsHintOrdersTheColumns) {
   boost::shared_ptr<MetaList> rows = MetaList::New(MetaType::Struct);
-  for (auto pair : {std::make_pair("t1", "accessible"), std::make_pair("tarn-22", "non-existent")}) {
+  for (auto pair :
+       {std::make_pair("t1", "accessible"), std::make_pair("tarn-22", "non-existent")}) {
     boost::shared_ptr<MetaStruct> row = MetaStruct::New("TarnsAreAccessible");
     row->SetField("TarnId", pair.first);
     row->SetField("Status", pair.second);

@@ -1,6 +1,6 @@
-#include "Fendle/MetaObj.h"
-
 #include <gtest/gtest.h>
+
+#include "Fendle/MetaObj.h"
 
 namespace {
 

@@ -1,10 +1,10 @@
-#include "Fendle/AutoCli.h"
-#include "HostCtl/Lib.h"
-#include "TestCommand.h"
-
 #include <gtest/gtest.h>
 
 #include <functional>
+
+#include "Fendle/AutoCli.h"
+#include "HostCtl/Lib.h"
+#include "TestCommand.h"
 
 namespace {
 

@@ -1,12 +1,11 @@
 // A command whose specifications and work are set by the test.
 #pragma once
 
-#include "Fendle/AutoCli.h"
-
 #include <boost/shared_ptr.hpp>
-
 #include <functional>
 #include <string>
+
+#include "Fendle/AutoCli.h"
 
 namespace FendleTest {
 

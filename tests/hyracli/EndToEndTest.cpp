@@ -1,6 +1,5 @@
 // Runs the built hyracli binary against the test plug-ins.
 #include <gtest/gtest.h>
-
 #include <sys/wait.h>
 
 #include <cstdlib>
@@ -43,9 +42,9 @@ class EndToEndTest : public ::testing::Test {
 
   // Runs the tool with only the given plug-in settings in its environment.
   Result Run(const Words& args, const std::string& environment = std::string()) {
-    std::string command = "env -u HYRACLI_PLUGIN_DIR HYRACLI_TEST_TRACE=" +
-                          Quote((dir_ / "trace").string()) + " " + environment + " " +
-                          Quote(HYRACLI_BINARY);
+    std::string command =
+        "env -u HYRACLI_PLUGIN_DIR HYRACLI_TEST_TRACE=" + Quote((dir_ / "trace").string()) + " " +
+        environment + " " + Quote(HYRACLI_BINARY);
     for (const std::string& arg : args) command += " " + Quote(arg);
     command += " >" + Quote((dir_ / "out").string()) + " 2>" + Quote((dir_ / "err").string());
     int raw = std::system(command.c_str());

@@ -1,11 +1,11 @@
 // A plug-in whose entry fails after it has already hung a command of its own
 // into the tree, as a plug-in does when the daemon library cannot be opened.
+#include <cstdlib>
+#include <fstream>
+
 #include "Fendle/AutoCli.h"
 #include "HostCtl/Lib.h"
 #include "OskCtl/Lib.h"
-
-#include <cstdlib>
-#include <fstream>
 
 namespace {
 
@@ -25,6 +25,7 @@ class Leftover : public Fendle::AutoCli::Command {
 
 extern "C" void AutoCli_RegisterNamespaces(boost::shared_ptr<Fendle::AutoCli::Namespace>& root) {
   root->GetNamespaceNode("storage")->RegisterNamespaceNode(Leftover::New(), "leftover");
-  throw OskCtl::Lib::OskCtlException("Unable to initialize tarnLib", "internal/StorageContainerLoad",
-                                     42, HostCtl::Lib::KelmMessage());
+  throw OskCtl::Lib::OskCtlException("Unable to initialize tarnLib",
+                                     "internal/StorageContainerLoad", 42,
+                                     HostCtl::Lib::KelmMessage());
 }

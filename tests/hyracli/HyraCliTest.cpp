@@ -1,13 +1,12 @@
-#include "hyracli/HyraCli.h"
-
-#include "HostCtl/Lib.h"
-#include "OskCtl/Lib.h"
-#include "tests/fendle/TestCommand.h"
-
 #include <gtest/gtest.h>
 
 #include <sstream>
 #include <stdexcept>
+
+#include "HostCtl/Lib.h"
+#include "OskCtl/Lib.h"
+#include "hyracli/HyraCli.h"
+#include "tests/fendle/TestCommand.h"
 
 namespace {
 
@@ -36,7 +35,8 @@ class HyraCliTest : public ::testing::Test {
     echo_ = TestCommand::New("Echo a \"text\"  back.");
     echo_->SetDefaultOutputFormatter("simple");
     boost::shared_ptr<Fendle::CallSpec::InputSpec> spec = Fendle::CallSpec::InputSpec::New();
-    spec->AddParameter(Parameter("text", ParameterType::String, "t", true, "The text to \"echo\" "));
+    spec->AddParameter(
+        Parameter("text", ParameterType::String, "t", true, "The text to \"echo\" "));
     spec->AddParameter(Parameter("times", ParameterType::Int, "", false, "How often"));
     echo_->SetInput(spec);
     echo_->SetBody([](const In& in, const Out& out) {
@@ -67,7 +67,8 @@ class HyraCliTest : public ::testing::Test {
         throw OskCtl::Lib::OskCtlException("Unable to initialize tarnLib", "internal/Throws", 9,
                                            HostCtl::Lib::KelmMessage());
       }
-      if (kind == "host") throw HostCtl::Lib::HostCtlException("host failed", HostCtl::Lib::KelmMessage());
+      if (kind == "host")
+        throw HostCtl::Lib::HostCtlException("host failed", HostCtl::Lib::KelmMessage());
       if (kind == "std") throw std::runtime_error("std failed\n");
       throw 42;
     });
@@ -242,12 +243,14 @@ TEST_F(HyraCliTest, UsageErrorsStopBeforeTheCommandRunsWithStatusTwo) {
       {{"storage", "test", "echo", "-t", "a", "--times", "x"}, "not an integer"},
       {{"storage", "test", "echo", "-t", "a", "extra"}, "Unexpected argument 'extra'"},
       {{"storage", "test", "echo", "-t", "a", "--bogus"}, "Unknown option '--bogus'"},
-      {{"storage", "test", "echo", "-t", "a", "--formatter", "json"}, "Unknown option '--formatter'"},
+      {{"storage", "test", "echo", "-t", "a", "--formatter", "json"},
+       "Unknown option '--formatter'"},
       {{"storage", "test", "echo", "-t", "a", "-t", "b"}, "--text is given more than once"},
       {{"--formatter", "xml", "storage", "test", "echo", "-t", "a"}, "Unknown formatter 'xml'"},
       {{"--formatter"}, "--formatter needs a value"},
       {{"--formatter="}, "--formatter needs a value"},
-      {{"--formatter", "json", "--formatter=table", "storage"}, "--formatter is given more than once"},
+      {{"--formatter", "json", "--formatter=table", "storage"},
+       "--formatter is given more than once"},
       {{"--verbose", "storage"}, "Unknown global option '--verbose'"},
   };
   for (const auto& c : cases) {

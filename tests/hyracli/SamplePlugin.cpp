@@ -1,13 +1,12 @@
 // A small plug-in for the tool's end-to-end tests, built in two parts:
 // part 1 creates "storage sample" with "hello"; part 2 adds "bye" and needs
 // part 1 to have been registered before it.
-#include "Fendle/AutoCli.h"
-#include "HostCtl/Lib.h"
-
 #include <boost/pointer_cast.hpp>
-
 #include <cstdlib>
 #include <fstream>
+
+#include "Fendle/AutoCli.h"
+#include "HostCtl/Lib.h"
 
 namespace {
 
