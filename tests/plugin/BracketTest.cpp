@@ -1,6 +1,6 @@
 // Opening and releasing the daemon client library: per object for the
 // commands that hold it, per invocation for the others, on every path.
-#include "PluginTestSupport.h"
+#include <functional>
 
 #include "CGAdd.h"
 #include "CGCreate.h"
@@ -11,20 +11,18 @@
 #include "FaultInjectionRuleAdd.h"
 #include "FaultInjectionRuleRemove.h"
 #include "FaultInjectionRuleSet.h"
+#include "HostCtl/Lib.h"
+#include "OskCtl/Lib.h"
+#include "PluginTestSupport.h"
 #include "StorageContainerCheckTarns.h"
 #include "StorageContainerLoad.h"
 #include "StorageContainerRemove.h"
+#include "TarnLibSim.h"
 #include "VendorProviderActivate.h"
 #include "VendorProviderDeactivate.h"
 #include "VendorProviderRemove.h"
 #include "VirtualVolumeGet.h"
 #include "VirtualVolumeMetaDataList.h"
-
-#include "HostCtl/Lib.h"
-#include "OskCtl/Lib.h"
-#include "TarnLibSim.h"
-
-#include <functional>
 
 namespace PluginTest {
 namespace {

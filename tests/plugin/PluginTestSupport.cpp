@@ -1,12 +1,12 @@
 #include "PluginTestSupport.h"
 
-#include "HostCtl/Lib.h"
-#include "TarnLibSim.h"
-#include "World.h"
-
 #include <cstdlib>
 #include <filesystem>
 #include <sstream>
+
+#include "HostCtl/Lib.h"
+#include "TarnLibSim.h"
+#include "World.h"
 
 namespace PluginTest {
 

@@ -3,17 +3,17 @@
 // values that tables can name.
 #pragma once
 
+#include <gtest/gtest.h>
+
+#include <boost/shared_ptr.hpp>
+#include <functional>
+#include <nlohmann/json.hpp>
+#include <string>
+#include <vector>
+
 #include "Fendle/AutoCli.h"
 #include "Fendle/CallSpec.h"
 #include "Fendle/MetaObj.h"
-
-#include <boost/shared_ptr.hpp>
-#include <gtest/gtest.h>
-#include <nlohmann/json.hpp>
-
-#include <functional>
-#include <string>
-#include <vector>
 
 namespace PluginTest {
 

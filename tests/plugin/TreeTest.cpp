@@ -1,5 +1,7 @@
 // The tree the entry hangs under `storage internal`, and how the entry fails.
-#include "PluginTestSupport.h"
+#include <boost/pointer_cast.hpp>
+#include <functional>
+#include <sstream>
 
 #include "CGAdd.h"
 #include "ConfigTarnAdd.h"
@@ -11,11 +13,15 @@
 #include "FaultInjectionRuleAdd.h"
 #include "FaultInjectionRuleRemove.h"
 #include "FaultInjectionRuleSet.h"
+#include "HostCtl/Lib.h"
 #include "KiroContextSet.h"
+#include "OskCtl/Lib.h"
+#include "PluginTestSupport.h"
 #include "StorageContainerAdd.h"
 #include "StorageContainerCheckTarns.h"
 #include "StorageContainerLoad.h"
 #include "StorageContainerRemove.h"
+#include "TarnLibSim.h"
 #include "TarnNamespace.h"
 #include "VendorProviderActivate.h"
 #include "VendorProviderAdd.h"
@@ -25,15 +31,6 @@
 #include "VendorProviderSet.h"
 #include "VirtualVolumeGet.h"
 #include "VirtualVolumeMetaDataList.h"
-
-#include "HostCtl/Lib.h"
-#include "OskCtl/Lib.h"
-#include "TarnLibSim.h"
-
-#include <boost/pointer_cast.hpp>
-
-#include <functional>
-#include <sstream>
 
 namespace PluginTest {
 namespace {
@@ -125,24 +122,29 @@ TEST_F(TreeTest, NamespacesHoldTheirChildrenInRegistrationOrderWithTheirDescript
       {"", {"internal"}, nullptr},
       {"internal", {"tarn"}, "Halvik internal storage commands."},
       {"internal tarn",
-       {"kiroprovider", "faultInjection", "storagecontainer", "configtarn", "daemon",
-        "kirocontext", "virtualvolume"},
+       {"kiroprovider", "faultInjection", "storagecontainer", "configtarn", "daemon", "kirocontext",
+        "virtualvolume"},
        "Operations pertaining to Virtual Volumes"},
       {"internal tarn kiroprovider",
        {"add", "set", "remove", "activate", "deactivate", "injectfault"},
        "Manage Tarn Kiro Provider Operations."},
       {"internal tarn faultInjection", {"enable", "rule"}, "Manage fault injection."},
       {"internal tarn faultInjection rule", {"add", "set", "remove"}, ""},
-      {"internal tarn storagecontainer", {"load", "add", "remove", "checktarns"},
+      {"internal tarn storagecontainer",
+       {"load", "add", "remove", "checktarns"},
        "Operations to create, manage, remove and restore Tarn StorageContainers."},
-      {"internal tarn configtarn", {"add", "remove", "umount", "mount"},
+      {"internal tarn configtarn",
+       {"add", "remove", "umount", "mount"},
        "Operations pertaining to config-tarns."},
-      {"internal tarn daemon", {"set"},
+      {"internal tarn daemon",
+       {"set"},
        "Operations pertaining to Tarn daemon to  set LogLevel,unbind timer and dump objects."},
       {"internal tarn kirocontext", {"set"}, "Operations on the Tarn Kiro context."},
-      {"internal tarn virtualvolume", {"get", "metadata"},
+      {"internal tarn virtualvolume",
+       {"get", "metadata"},
        "Operations on a specific virtual volume."},
-      {"internal tarn virtualvolume metadata", {"list"},
+      {"internal tarn virtualvolume metadata",
+       {"list"},
        "Operations on the metadata for a specific virtual volume."},
   };
   RegisterAll();
@@ -300,9 +302,12 @@ TEST_F(TreeTest, CommandThatCannotOpenTheLibraryLeavesNoTarnAndNoOpening) {
     int line;  // 0: any line
   };
   const Case cases[] = {
-      {"internal/VendorProviderRemove", 35},   {"internal/VendorProviderActivate", 36},
-      {"internal/VendorProviderDeactivate", 36}, {"internal/StorageContainerLoad", 42},
-      {"internal/StorageContainerRemove", 31}, {"internal/StorageContainerCheckTarns", 40},
+      {"internal/VendorProviderRemove", 35},
+      {"internal/VendorProviderActivate", 36},
+      {"internal/VendorProviderDeactivate", 36},
+      {"internal/StorageContainerLoad", 42},
+      {"internal/StorageContainerRemove", 31},
+      {"internal/StorageContainerCheckTarns", 40},
       {"internal/DaemonCommand", 0},
   };
   for (int64_t passing = 0; passing < 7; ++passing) {
@@ -319,8 +324,8 @@ TEST_F(TreeTest, CommandThatCannotOpenTheLibraryLeavesNoTarnAndNoOpening) {
       EXPECT_EQ(e.GetMessage(false), "Unable to initialize tarnLib");
       EXPECT_EQ(e.GetSourceFile(), c.source);
       if (c.line != 0) {
-      EXPECT_EQ(e.GetLine(), c.line);
-    }
+        EXPECT_EQ(e.GetLine(), c.line);
+      }
       EXPECT_GT(e.GetLine(), 0);
     }
     // The new internal stays, empty; the commands built before are gone and

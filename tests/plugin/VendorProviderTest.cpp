@@ -1,20 +1,18 @@
 // The six kiroprovider commands against the simulated host: the order of
 // their checks, their exact texts, and what they leave stored.
-#include "PluginTestSupport.h"
+#include <optional>
 
+#include "HostCtl/Lib.h"
+#include "PluginTestSupport.h"
+#include "TarnLib/TarnLib.h"
+#include "TarnLibSim.h"
 #include "VendorProviderActivate.h"
 #include "VendorProviderAdd.h"
 #include "VendorProviderDeactivate.h"
 #include "VendorProviderInjectFault.h"
 #include "VendorProviderRemove.h"
 #include "VendorProviderSet.h"
-
-#include "HostCtl/Lib.h"
-#include "TarnLib/TarnLib.h"
-#include "TarnLibSim.h"
 #include "World.h"
-
-#include <optional>
 
 namespace PluginTest {
 namespace {
@@ -103,16 +101,14 @@ TEST_F(KiroProviderTest, AddRefusesBadInputInOrderAndStoresNothing) {
        kMismatch},
       {"priorities missing", ProviderInput("vp9", "u", {{"A"}, {}, {true}}), nullptr, kMismatch},
       {"ids missing", ProviderInput("vp9", "u", {{}, {1}, {true}}), nullptr, kMismatch},
-      {"priority above 32 bits", ProviderInput("vp9", "u", {{"A"}, {4294967297}, {true}}),
-       nullptr,
+      {"priority above 32 bits", ProviderInput("vp9", "u", {{"A"}, {4294967297}, {true}}), nullptr,
        "Invalid value for parameter priority: 4294967297 is outside the range -2147483648 to "
        "2147483647"},
       {"priority 2^31", ProviderInput("vp9", "u", {{"A", "B"}, {1, 2147483648}, {true, true}}),
        nullptr,
        "Invalid value for parameter priority: 2147483648 is outside the range -2147483648 to "
        "2147483647"},
-      {"priority below -2^31", ProviderInput("vp9", "u", {{"A"}, {-2147483649}, {true}}),
-       nullptr,
+      {"priority below -2^31", ProviderInput("vp9", "u", {{"A"}, {-2147483649}, {true}}), nullptr,
        "Invalid value for parameter priority: -2147483649 is outside the range -2147483648 to "
        "2147483647"},
   };
@@ -135,7 +131,8 @@ TEST_F(KiroProviderTest, AddStoresTheProviderWithItsArraysPairedInOrder) {
   };
   const Case cases[] = {
       {"no arrays", ProviderInput("vp9", "https://vp9"), Provider("vp9", "https://vp9", {})},
-      {"repeated id kept", ProviderInput("vp9", "u", {{"A", "B", "A"}, {1, 2, 3}, {true, false, true}}),
+      {"repeated id kept",
+       ProviderInput("vp9", "u", {{"A", "B", "A"}, {1, 2, 3}, {true, false, true}}),
        Provider("vp9", "u", {{"A", true, 1}, {"B", false, 2}, {"A", true, 3}})},
       {"32-bit limits and empty values",
        ProviderInput("vp9", "", {{"", "B"}, {-2147483648LL, 2147483647}, {false, false}}),
@@ -145,7 +142,8 @@ TEST_F(KiroProviderTest, AddStoresTheProviderWithItsArraysPairedInOrder) {
     SCOPED_TRACE(c.name);
     HyraSim::InitDemo();
     boost::shared_ptr<VendorProviderAdd> add = VendorProviderAdd::New();
-    EXPECT_EQ(RunCommand(*add, c.input), (Calls{Text("Succesfully Added VP with name : vp9\n"), "finish"}));
+    EXPECT_EQ(RunCommand(*add, c.input),
+              (Calls{Text("Succesfully Added VP with name : vp9\n"), "finish"}));
     EXPECT_EQ(ProviderNamed("vp9"), c.stored);
     EXPECT_EQ(Providers().size(), 3u);
   }
@@ -163,17 +161,39 @@ TEST_F(KiroProviderTest, AddReportsHostFailuresBehindItsPrefix) {
   };
   const Arrays one{{"A"}, {1}, {true}};
   const Case cases[] = {
-      {"first update", ProviderInput("vp9", "u"), "UpdateTarnVendorProvider", 0,
-       RecordingOutput::ThrowOn::kNothing, {"error: Failed to add VP: boom"}, false},
+      {"first update",
+       ProviderInput("vp9", "u"),
+       "UpdateTarnVendorProvider",
+       0,
+       RecordingOutput::ThrowOn::kNothing,
+       {"error: Failed to add VP: boom"},
+       false},
       // Without arrays the provider is read back and stored a second time.
-      {"read back", ProviderInput("vp9", "u"), "GetTarnVendorProviders", 0,
-       RecordingOutput::ThrowOn::kNothing, {"error: Failed to add VP: boom"}, true},
-      {"second update", ProviderInput("vp9", "u"), "UpdateTarnVendorProvider", 1,
-       RecordingOutput::ThrowOn::kNothing, {"error: Failed to add VP: boom"}, true},
-      {"no second update with arrays", ProviderInput("vp9", "u", one), "UpdateTarnVendorProvider",
-       1, RecordingOutput::ThrowOn::kNothing,
-       {Text("Succesfully Added VP with name : vp9\n"), "finish"}, true},
-      {"sink refuses the result", ProviderInput("vp9", "u", one), nullptr, 0,
+      {"read back",
+       ProviderInput("vp9", "u"),
+       "GetTarnVendorProviders",
+       0,
+       RecordingOutput::ThrowOn::kNothing,
+       {"error: Failed to add VP: boom"},
+       true},
+      {"second update",
+       ProviderInput("vp9", "u"),
+       "UpdateTarnVendorProvider",
+       1,
+       RecordingOutput::ThrowOn::kNothing,
+       {"error: Failed to add VP: boom"},
+       true},
+      {"no second update with arrays",
+       ProviderInput("vp9", "u", one),
+       "UpdateTarnVendorProvider",
+       1,
+       RecordingOutput::ThrowOn::kNothing,
+       {Text("Succesfully Added VP with name : vp9\n"), "finish"},
+       true},
+      {"sink refuses the result",
+       ProviderInput("vp9", "u", one),
+       nullptr,
+       0,
        RecordingOutput::ThrowOn::kResult,
        {Text("Succesfully Added VP with name : vp9\n"), "error: Failed to add VP: sink failed"},
        true},
@@ -231,7 +251,8 @@ TEST_F(KiroProviderTest, SetReplacesTheArraysAndKeepsTheStoredUrl) {
   };
   const Case cases[] = {
       {"no arrays", {}, Provider("vp1", kVp1Url, {})},
-      {"given arrays only", {{"array-c", "X"}, {7, -1}, {false, true}},
+      {"given arrays only",
+       {{"array-c", "X"}, {7, -1}, {false, true}},
        Provider("vp1", kVp1Url, {{"array-c", false, 7}, {"X", true, -1}})},
   };
   for (const Case& c : cases) {
@@ -308,12 +329,13 @@ TEST_F(DaemonOpenTest, ActivateAndDeactivatePassTheirValuesAndReportDaemonErrors
     };
   };
 
-  EXPECT_EQ(RunCommand(*activate, args("vp1", "array-a", std::nullopt)), (Calls{"result: true", "finish"}));
-  EXPECT_EQ(RunCommand(*activate, args("vp2", "array-c", "https://old")), (Calls{"result: true", "finish"}));
+  EXPECT_EQ(RunCommand(*activate, args("vp1", "array-a", std::nullopt)),
+            (Calls{"result: true", "finish"}));
+  EXPECT_EQ(RunCommand(*activate, args("vp2", "array-c", "https://old")),
+            (Calls{"result: true", "finish"}));
   EXPECT_EQ(RunCommand(*deactivate, args("vp1", "array-b", std::nullopt)),
             (Calls{"result: true", "finish"}));
-  EXPECT_EQ(Daemon()["activations"],
-            json::parse(R"([
+  EXPECT_EQ(Daemon()["activations"], json::parse(R"([
               {"arrayId": "array-a", "provider": "vp1", "active": true, "activeProviderUrl": ""},
               {"arrayId": "array-c", "provider": "vp2", "active": true,
                "activeProviderUrl": "https://old"},
@@ -357,8 +379,8 @@ TEST_F(DaemonOpenTest, InjectFaultRefusesBeforeTheDaemonIsCalled) {
        "Missing one of the parameter arrayId or isActive"},
       {"lookup fails", InjectInput("vp1", "offline", {"A"}, {true}), "GetTarnVendorProviders",
        false, "InjectFault failed for VPboom"},
-      {"known but without a record", InjectInput("vp1", "offline"), "GetTarnVendorProviders",
-       true, "VP : vp1 does not exist\n"},
+      {"known but without a record", InjectInput("vp1", "offline"), "GetTarnVendorProviders", true,
+       "VP : vp1 does not exist\n"},
   };
   boost::shared_ptr<VendorProviderInjectFault> inject = VendorProviderInjectFault::New();
   for (const Case& c : cases) {
@@ -377,11 +399,14 @@ TEST_F(DaemonOpenTest, InjectFaultHandsTheDaemonNameUrlStatusAndArrays) {
     json fault;
   };
   const Case cases[] = {
-      {"no status, no arrays", InjectInput("vp1", std::nullopt),
+      {"no status, no arrays",
+       InjectInput("vp1", std::nullopt),
        {{"provider", "vp1"}, {"url", kVp1Url}, {"status", "default"}, {"arrays", json::array()}}},
-      {"empty status", InjectInput("vp1", ""),
+      {"empty status",
+       InjectInput("vp1", ""),
        {{"provider", "vp1"}, {"url", kVp1Url}, {"status", "default"}, {"arrays", json::array()}}},
-      {"arrays in order", InjectInput("vp1", "syncError", {"array-b", "Q"}, {false, true}),
+      {"arrays in order",
+       InjectInput("vp1", "syncError", {"array-b", "Q"}, {false, true}),
        {{"provider", "vp1"},
         {"url", kVp1Url},
         {"status", "syncError"},
