@@ -1,0 +1,171 @@
+// Armed failures: counts shared between processes, injected texts, and the
+// "nothing" answers of --null.
+#include <memory>
+#include <string>
+
+#include "HostCtl/Lib.h"
+#include "OskCtl/Storage.h"
+#include "SimTest.h"
+#include "TarnLib/TarnLib.h"
+
+namespace {
+
+using HostCtl::Lib::HostCtlException;
+using HostCtl::Storage::TarnFileSystem;
+using OskCtl::Storage::StorageInfoImpl;
+using SimTest::FreshWorld;
+using SimTest::Opened;
+
+using Failures = FreshWorld;
+
+HyraSim::FailureSpec Spec(const std::string& message, int64_t after, int64_t times, bool null) {
+  HyraSim::FailureSpec spec;
+  spec.message = message;
+  spec.after = after;
+  spec.times = times;
+  spec.null = null;
+  return spec;
+}
+
+TEST_F(Failures, AfterAndTimesCountAcrossProcesses) {
+  ASSERT_EQ(Hyrasim("fail TarnVpExists --after 1 --times 2 --message 'host is busy'").status, 0);
+  const char* expected[] = {"true\n", "error: host is busy\n", "error: host is busy\n", "true\n"};
+  for (const char* answer : expected) EXPECT_EQ(Probe("vp-exists vp1").out, answer);
+  EXPECT_TRUE(HyraSim::ArmedFailures().empty()) << "a spent arming is gone";
+}
+
+TEST_F(Failures, ArmingAgainReplacesAndClearDisarmsEverything) {
+  HyraSim::ArmFailure("TarnVpExists", Spec("first", 5, 5, false));
+  HyraSim::ArmFailure("TarnVpExists", Spec("second", 0, 1, false));
+  HyraSim::ArmFailure("GetTarnFileSystems", Spec("x", 0, 1, false));
+  StorageInfoImpl host;
+  try {
+    host.TarnVpExists("vp1");
+    ADD_FAILURE() << "no exception";
+  } catch (const HostCtlException& e) {
+    EXPECT_EQ(e.GetMessage(false), "second");
+  }
+  HyraSim::ClearFailures();
+  EXPECT_TRUE(host.TarnVpExists("vp1"));
+  const auto systems = host.GetTarnFileSystems();
+  EXPECT_EQ(systems.size(), 1u);
+  for (TarnFileSystem* fs : systems) delete fs;
+}
+
+TEST_F(Failures, ArmingRefusesUnknownNamesAndBadCounts) {
+  const std::string refused[] = {
+      "fail NoSuchOperation",
+      "fail TarnLib_Exit",
+      "fail TarnLib_FreeTarnInfo",
+      "fail TarnVpExists --times 0",
+      "fail TarnVpExists --after -1",
+      "fail TarnVpExists --after",
+      "fail TarnVpExists --times 2x",
+      "fail TarnVpExists --loud",
+      "fail",
+  };
+  for (const std::string& arguments : refused) {
+    const SimTest::ToolResult result = Hyrasim(arguments);
+    EXPECT_NE(result.status, 0) << arguments;
+    EXPECT_NE(result.err.find("hyrasim: "), std::string::npos) << arguments;
+  }
+  EXPECT_TRUE(HyraSim::ArmedFailures().empty()) << "nothing half written";
+}
+
+TEST_F(Failures, DaemonCallsFailWithTheInjectedText) {
+  Opened opened;
+  HyraSim::ArmFailure("TarnLib_ActivateProvider", Spec("array offline", 0, 1, false));
+  unsigned char block[TARNLIB_ACTIVATION_BLOCK_SIZE] = {};
+  const TarnLib_Status status = TarnLib_ActivateProvider("array-a", "vp1", "", block);
+  EXPECT_NE(status, 0);
+  EXPECT_STREQ(TarnLib_Err2String(status), "array offline");
+  EXPECT_TRUE(World()["daemon"]["activations"].empty()) << "the failed call had no effect";
+  EXPECT_EQ(TarnLib_ActivateProvider("array-a", "vp1", "", block), 0);
+
+  HyraSim::ArmFailure("TarnLib_GetStorageContainer", Spec("no route to Tarnd", 0, 1, false));
+  StorageContainerResult* result = nullptr;
+  const TarnLib_ErrorEx error = TarnLib_GetStorageContainer(1, nullptr, &result);
+  EXPECT_FALSE(TarnLib_ErrorExIsSuccess(&error));
+  EXPECT_STREQ(TarnLib_ErrorExStr(&error), "no route to Tarnd");
+  EXPECT_EQ(result, nullptr);
+
+  HyraSim::ArmFailure("TarnLib_Init", Spec("x", 0, 1, false));
+  EXPECT_FALSE(TarnLib_Init(0, 0));
+  EXPECT_EQ(TarnLibSim_Openings(), 1);
+  HyraSim::ArmFailure("TarnLib_NormalizeContainerIdString", Spec("x", 0, 1, true));
+  char normal[TARNLIB_CONTAINER_ID_TEXT_SIZE];
+  EXPECT_FALSE(TarnLib_NormalizeContainerIdString(SimTest::kGoldId, normal));
+  EXPECT_TRUE(TarnLib_NormalizeContainerIdString(SimTest::kGoldId, normal));
+}
+
+TEST_F(Failures, HostOperationsFailWithoutEffect) {
+  StorageInfoImpl host;
+  HyraSim::ArmFailure("AddTarnFileSystem", Spec("mount refused", 0, 1, false));
+  std::string id = SimTest::kSilverId;
+  EXPECT_THROW(host.AddTarnFileSystem("silver", id, {}, true), HostCtlException);
+  HyraSim::ArmFailure("CreateConfigTarn", Spec("create refused", 0, 1, false));
+  TarnFileSystem* gold = host.GetTarnFileSystemByPath("/hyra/volumes/gold");
+  std::string path;
+  EXPECT_THROW(gold->CreateConfigTarn("new", "", 1, "", path, "", false), HostCtlException);
+  const auto world = World();
+  EXPECT_EQ(world["host"]["mounted"].size(), 1u);
+  EXPECT_EQ(world["containers"][0]["tarns"].size(), 2u);
+}
+
+TEST_F(Failures, NullAnswersNothingWithoutEffect) {
+  auto arm = [](const char* operation) {
+    HyraSim::ArmFailure(operation, Spec("unused", 0, 1, true));
+  };
+  StorageInfoImpl host;
+  TarnFileSystem* gold = host.GetTarnFileSystemByPath("/hyra/volumes/gold");
+  ASSERT_NE(gold, nullptr);
+
+  arm("AddTarnFileSystem");
+  std::string id = SimTest::kSilverId;
+  EXPECT_EQ(host.AddTarnFileSystem("silver", id, {}, true), nullptr);
+  arm("GetTarnFileSystems");
+  EXPECT_TRUE(host.GetTarnFileSystems().empty());
+  arm("GetTarnFileSystemByPath");
+  EXPECT_EQ(host.GetTarnFileSystemByPath("/hyra/volumes/gold"), nullptr);
+  arm("TarnVpExists");
+  EXPECT_FALSE(host.TarnVpExists("vp1"));
+  arm("GetContainerName");
+  EXPECT_EQ(gold->GetContainerName(), "");
+  arm("MatchesContainerId");
+  EXPECT_FALSE(gold->MatchesContainerId(SimTest::kGoldId));
+  arm("CheckTarnAccessibility");
+  EXPECT_TRUE(gold->CheckTarnAccessibility({SimTest::kGoldTarn}).empty());
+  arm("UpdateTarnVendorProvider");
+  host.UpdateTarnVendorProvider({HostCtl::Storage::VendorProviderInfo{"vp5", "u", "", {}}});
+  arm("UnRegisterVendorProvider");
+  OskCtl::Storage::TarnFileSystemImpl::UnRegisterVendorProvider("no-such-provider");
+  arm("RemoveConfigTarn");
+  gold->RemoveConfigTarn("vm-config-1", "", "", false);
+
+  Opened opened;
+  arm("TarnLib_GetTarnInfo");
+  TarnInfo placeholderInfo{};
+  TarnInfo* info = &placeholderInfo;
+  EXPECT_EQ(TarnLib_GetTarnInfo(SimTest::kGoldId, SimTest::kGoldTarn, &info), 0);
+  EXPECT_EQ(info, nullptr);
+  arm("TarnLib_QueryAllConfigTarns");
+  QueryResult placeholderResult{};
+  QueryResult* result = &placeholderResult;
+  EXPECT_EQ(TarnLib_QueryAllConfigTarns(SimTest::kGoldId, 2147483647, 0, &result, 0), 0);
+  EXPECT_EQ(result, nullptr);
+  arm("TarnLib_SetFaultInjectionEnabled");
+  EXPECT_FALSE(TarnLib_SetFaultInjectionEnabled(true));
+  arm("TarnLib_DebugCommand");
+  const int32_t level = 64;
+  EXPECT_EQ(TarnLib_DebugCommand(&level, nullptr, nullptr), 0);
+
+  const auto world = World();
+  EXPECT_EQ(world["host"]["mounted"].size(), 1u);
+  EXPECT_EQ(world["host"]["providers"].size(), 2u);
+  EXPECT_EQ(world["containers"][0]["tarns"].size(), 2u);
+  EXPECT_EQ(world["daemon"]["faultInjection"]["enabled"], false);
+  EXPECT_EQ(world["daemon"]["logLevel"], 4);
+  EXPECT_TRUE(HyraSim::ArmedFailures().empty());
+}
+
+}  // namespace

@@ -1,0 +1,191 @@
+// The scenario format through hyrasim and the world interface: round trips,
+// refusals that name the field, and the database file itself.
+#include <sys/stat.h>
+
+#include <string>
+
+#include "OskCtl/Storage.h"
+#include "SimTest.h"
+
+namespace {
+
+using SimTest::FreshWorld;
+using Json = nlohmann::ordered_json;
+
+using Scenario = FreshWorld;
+
+// A scenario with every field given, so that reading and writing it again
+// must reproduce it exactly.
+const char kFullScenario[] = R"json({
+  "daemon": { "running": false, "logLevel": 8, "dumpRequests": 3, "unbindPeriod": 300000000,
+              "faultInjection": { "enabled": true, "rules": [ { "operation": "*", "fault": "STORAGE_FAULT", "frequency": 10, "time": -1 } ] },
+              "spaceEfficiencyManipulation": true,
+              "activations": [ { "arrayId": "array-a", "provider": "vp1", "active": true, "activeProviderUrl": "" } ],
+              "providerFaults": [ { "provider": "vp1", "url": "https://vp1.example.test:8443/kiro", "status": "offline",
+                                    "arrays": [ { "arrayId": "array-a", "isActive": false } ] } ] },
+  "arrays": [
+    { "id": "array-a", "name": "Array A", "vendorId": "ACME", "modelId": "M100",
+      "protocolEndpoints": [
+        { "localUID": "pe-a1", "type": "NFS", "ipAddress": "192.0.2.10", "serverMount": "/exports/a1", "accessible": true, "configured": false },
+        { "localUID": "pe-a2", "type": "SCSI", "lunId": "lun-0001", "accessible": true, "configured": true },
+        { "localUID": "pe-a3", "type": "NFS4x", "addresses": [], "serverMount": "/exports/a3", "accessible": false, "configured": true } ] } ],
+  "containers": [
+    { "name": "gold", "id": "6F1C2F4E8D3B4C1A9E2F0A1B2C3D4E5F", "vpUrl": "https://vp1.example.test:8443/kiro",
+      "maxTarnSizeMB": 2097152, "arrays": ["array-a"],
+      "tarns": [
+        { "uuid": "0c9e2d1a-3b4f-4a5e-8f70-112233445566", "logicalSizeMB": 10240, "committedSizeMB": 2048,
+          "unsharedSizeMB": null, "storageProfile": null, "blockSize": 4096,
+          "metadata": [ ["owner", "ops"], ["owner", "twice"] ], "accessibility": 7,
+          "configTarn": { "name": "vm-config-1", "policy": "p", "vmUuid": "", "mounted": false } } ] } ],
+  "host": {
+    "providers": [ { "name": "vp1", "url": "https://vp1.example.test:8443/kiro", "reserved": "kept",
+                     "arrays": [ { "arrayId": "array-a", "isActive": true, "priority": -1 } ] } ],
+    "mounted": [ { "name": "gold", "id": "not even an id", "arrays": ["array-a"] } ],
+    "kiroContext": "zm-1" }
+})json";
+
+TEST_F(Scenario, InitThenShowGivesTheSameDocument) {
+  WriteFile("full.json", kFullScenario);
+  ASSERT_EQ(Hyrasim("init --scenario " + Path("full.json").string()).status, 0);
+  const SimTest::ToolResult shown = Hyrasim("show --json");
+  ASSERT_EQ(shown.status, 0);
+  EXPECT_EQ(Json::parse(shown.out), Json::parse(kFullScenario));
+
+  // And the exported text reads back to itself, byte for byte.
+  HyraSim::InitScenario(shown.out);
+  EXPECT_EQ(HyraSim::ExportScenario(), shown.out);
+}
+
+TEST_F(Scenario, DemoWorldRoundTripsAndHasWhatOthersRelyOn) {
+  const std::string demo = HyraSim::ExportScenario();
+  HyraSim::InitScenario(demo);
+  EXPECT_EQ(HyraSim::ExportScenario(), demo);
+  const Json world = Json::parse(demo);
+  EXPECT_EQ(world["containers"].size(), 4u);
+  EXPECT_EQ(world["host"]["mounted"][0]["name"], "gold");
+  EXPECT_EQ(world["host"]["providers"][1]["name"], "vp2");
+}
+
+TEST_F(Scenario, BadScenariosNameTheFieldAndChangeNothing) {
+  struct Case {
+    const char* json;
+    const char* error;
+  };
+  const Case cases[] = {
+      {"[]", "scenario: document: must be an object"},
+      {"{\"arrays\": [", "scenario: not valid JSON"},
+      {R"({"colour": 1})", "scenario: colour: is not a field of this record"},
+      {R"({"daemon": {"logLevel": "high"}})", "scenario: daemon.logLevel: must be a whole number"},
+      {R"({"daemon": {"unbindPeriod": 2147483648}})", "daemon.unbindPeriod: must be between"},
+      {R"({"daemon": {"faultInjection": {"rules": [{"fault": "F"}, {"operation": "*", "fault": "F"}]}}})",
+       "daemon.faultInjection.rules[1]: duplicate rule \"*, F\""},
+      {R"({"daemon": {"providerFaults": [{"provider": "p", "status": "Online"}]}})",
+       "daemon.providerFaults[0].status: must be online, offline, syncError, unknown or default"},
+      {R"({"arrays": [{"id": "a"}, {"id": "a"}]})", "arrays[1].id: duplicate array id \"a\""},
+      {R"({"arrays": [{"id": "a", "protocolEndpoints": [{"localUID": "u", "type": "FC"}]}]})",
+       "arrays[0].protocolEndpoints[0].type: must be SCSI, NFS or NFS4x"},
+      {R"({"arrays": [{"id": "a", "protocolEndpoints": [{"localUID": "u", "type": "SCSI", "ipAddress": "x"}]}]})",
+       "arrays[0].protocolEndpoints[0].ipAddress: is not a field of this record"},
+      {R"({"arrays": [{"id": "a", "protocolEndpoints": [{"localUID": "u", "type": "SCSI"}]},
+                      {"id": "b", "protocolEndpoints": [{"localUID": "u", "type": "SCSI"}]}]})",
+       "arrays[1].protocolEndpoints[0].localUID: duplicate endpoint localUID \"u\""},
+      {R"({"containers": [{"name": "c", "id": "6f1c2f4e-8d3b-4c1a-9e2f-0a1b2c3d4e5"}]})",
+       "containers[0].id: \"6f1c2f4e-8d3b-4c1a-9e2f-0a1b2c3d4e5\" is not a valid container id"},
+      {R"({"containers": [{"name": "c", "id": "6f1c2f4e-8d3b-4c1a-9e2f-0a1b2c3d4e5f"},
+                          {"name": "d", "id": "6F1C2F4E8D3B4C1A9E2F0A1B2C3D4E5F"}]})",
+       "containers[1].id: duplicate container id"},
+      {R"({"containers": [{"name": "c", "id": "6f1c2f4e-8d3b-4c1a-9e2f-0a1b2c3d4e5f", "arrays": ["nope"]}]})",
+       "containers[0].arrays[0]: no array has the id \"nope\""},
+      {R"({"containers": [{"name": "c", "id": "6f1c2f4e-8d3b-4c1a-9e2f-0a1b2c3d4e5f",
+                           "tarns": [{"uuid": "AB"}, {"uuid": "ab"}]}]})",
+       "containers[0].tarns[1].uuid: duplicate tarn uuid \"ab\""},
+      {R"({"containers": [{"name": "c", "id": "6f1c2f4e-8d3b-4c1a-9e2f-0a1b2c3d4e5f",
+                           "tarns": [{"uuid": "t", "logicalSizeMB": -1}]}]})",
+       "containers[0].tarns[0].logicalSizeMB: must be between 0 and"},
+      {R"({"containers": [{"name": "c", "id": "6f1c2f4e-8d3b-4c1a-9e2f-0a1b2c3d4e5f",
+                           "tarns": [{"uuid": "t", "metadata": [["k"]]}]}]})",
+       "containers[0].tarns[0].metadata[0]: must be a pair [key, value]"},
+      {R"({"containers": [{"name": "c", "id": "6f1c2f4e-8d3b-4c1a-9e2f-0a1b2c3d4e5f",
+                           "tarns": [{"uuid": "t", "configTarn": {"name": "x"}},
+                                     {"uuid": "u", "configTarn": {"name": "x"}}]}]})",
+       "containers[0].tarns[1].configTarn.name: duplicate config-tarn name \"x\""},
+      {R"({"host": {"providers": [{"name": "p"}, {"name": "p"}]}})",
+       "host.providers[1].name: duplicate provider name \"p\""},
+      {R"({"host": {"providers": [{"url": "u"}]}})", "host.providers[0].name: is missing"},
+      {R"({"host": {"mounted": [{"name": "../x", "id": "i"}]}})",
+       "host.mounted[0].name: \"../x\" cannot be a directory name"},
+      {R"({"host": {"kiroContext": "a\u0000b"}})",
+       "host.kiroContext: must not contain a NUL character"},
+  };
+  const std::string before = HyraSim::ExportScenario();
+  for (const Case& c : cases) {
+    WriteFile("bad.json", c.json);
+    const SimTest::ToolResult result = Hyrasim("init --scenario " + Path("bad.json").string());
+    EXPECT_NE(result.status, 0) << c.json;
+    EXPECT_NE(result.err.find(c.error), std::string::npos) << result.err;
+  }
+  EXPECT_EQ(HyraSim::ExportScenario(), before);
+}
+
+TEST_F(Scenario, TextsThatAreNotUtf8AreStoredAndShownReplaced) {
+  OskCtl::Storage::StorageInfoImpl host;
+  HostCtl::Storage::VendorProviderInfo provider;
+  provider.name = "vp\xff\xfe";
+  host.UpdateTarnVendorProvider({provider});
+  EXPECT_TRUE(host.TarnVpExists("vp\xff\xfe")) << "stored as given";
+  const Json world = Json::parse(HyraSim::ExportScenario());
+  EXPECT_EQ(world["host"]["providers"][2]["name"], "vp\xEF\xBF\xBD\xEF\xBF\xBD");
+}
+
+TEST_F(Scenario, DatabaseIsPrivateAndFollowsTheEnvironment) {
+  struct stat info;
+  ASSERT_EQ(stat(Path("world.db").c_str(), &info), 0);
+  EXPECT_EQ(info.st_mode & 0777, 0600u);
+
+  // Without HYRA_SIM_DB the world lives below XDG_STATE_HOME, created on use.
+  const std::string state = Path("state").string();
+  unsetenv("HYRA_SIM_DB");
+  setenv("XDG_STATE_HOME", state.c_str(), 1);
+  EXPECT_EQ(HyraSim::DatabasePath(), state + "/hyrasim/world.db");
+  HyraSim::SetDaemonRunning(false);
+  EXPECT_EQ(World()["daemon"]["running"], false);
+  unsetenv("XDG_STATE_HOME");
+  ASSERT_EQ(stat((state + "/hyrasim/world.db").c_str(), &info), 0);
+
+  // Switching back reaches the first world again, untouched.
+  setenv("HYRA_SIM_DB", Path("world.db").c_str(), 1);
+  EXPECT_EQ(World()["daemon"]["running"], true);
+}
+
+TEST_F(Scenario, HyrasimRefusesWhatItCannotDo) {
+  const char* refused[] = {"bogus",       "init",           "init --scenario",
+                           "show --yaml", "daemon restart", "daemon"};
+  for (const char* arguments : refused) {
+    const SimTest::ToolResult result = Hyrasim(arguments);
+    EXPECT_NE(result.status, 0) << arguments;
+    EXPECT_EQ(result.err.rfind("hyrasim: ", 0), 0u) << arguments << ": " << result.err;
+  }
+  EXPECT_EQ(Hyrasim("daemon stop").status, 0);
+  EXPECT_EQ(World()["daemon"]["running"], false);
+}
+
+TEST_F(Scenario, SeveralProcessesWritingAtOnceLoseNothing) {
+  std::string command = "(";
+  for (int i = 0; i < 6; ++i) {
+    command += std::string(SIM_PROBE_PATH) + " add-providers p" + std::to_string(i) + " 30 >>" +
+               Path("errors.txt").string() + " 2>&1 & ";
+  }
+  command += "wait)";
+  ASSERT_EQ(std::system(command.c_str()), 0);
+  EXPECT_EQ(ReadText(Path("errors.txt").string()), "");
+  OskCtl::Storage::StorageInfoImpl host;
+  for (int i = 0; i < 6; ++i) {
+    for (int j = 0; j < 30; ++j) {
+      const std::string name = "p" + std::to_string(i) + "-" + std::to_string(j);
+      EXPECT_TRUE(host.TarnVpExists(name)) << name;
+    }
+  }
+  EXPECT_EQ(World()["host"]["providers"].size(), 2u + 6 * 30);
+}
+
+}  // namespace

@@ -1,0 +1,38 @@
+// A small program that uses the stand-in host libraries from its own process,
+// so that tests can see what several processes do to one world.
+//
+//   sim_probe add-providers PREFIX COUNT   registers PREFIX-0 .. PREFIX-(COUNT-1)
+//   sim_probe vp-exists NAME               prints true or false
+//
+// A host failure is printed as "error: TEXT" with exit status 3.
+#include <iostream>
+#include <string>
+
+#include "HostCtl/Lib.h"
+#include "OskCtl/Storage.h"
+
+int main(int argc, char** argv) {
+  const std::string command = argc > 1 ? argv[1] : "";
+  try {
+    OskCtl::Storage::StorageInfoImpl host;
+    if (command == "add-providers" && argc == 4) {
+      const int count = std::stoi(argv[3]);
+      for (int i = 0; i < count; ++i) {
+        HostCtl::Storage::VendorProviderInfo provider;
+        provider.name = std::string(argv[2]) + "-" + std::to_string(i);
+        provider.url = "https://" + provider.name + ".example.test/kiro";
+        host.UpdateTarnVendorProvider({provider});
+      }
+      return 0;
+    }
+    if (command == "vp-exists" && argc == 3) {
+      std::cout << (host.TarnVpExists(argv[2]) ? "true" : "false") << "\n";
+      return 0;
+    }
+  } catch (const HostCtl::Lib::HostCtlException& e) {
+    std::cout << "error: " << e.GetMessage() << "\n";
+    return 3;
+  }
+  std::cerr << "usage: sim_probe add-providers PREFIX COUNT | vp-exists NAME\n";
+  return 2;
+}
