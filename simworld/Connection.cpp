@@ -78,16 +78,16 @@ class Holder {
  public:
   ~Holder() { Close(); }
 
-  OpenedDatabase Get() {
+  OpenedDatabase Get(void (*check)(sqlite3*)) {
     const std::string path = DatabasePath();
     if (db_ != nullptr && path == path_ && IdentityOf(path) == identity_) return {db_, false};
     Close();
-    Open(path);
+    Open(path, check);
     return {db_, true};
   }
 
  private:
-  void Open(const std::string& path) {
+  void Open(const std::string& path, void (*check)(sqlite3*)) {
     if (EnvText("HYRA_SIM_DB") == nullptr) {
       const size_t slash = path.rfind('/');
       if (slash != std::string::npos && slash > 0) MakeDirectories(path.substr(0, slash));
@@ -110,11 +110,12 @@ class Holder {
     }
     try {
       sqlite3_busy_timeout(db, kBusyTimeoutMs);
+      check(db);
       ExecPatiently(db, "PRAGMA journal_mode=WAL");
       ExecPatiently(db, "PRAGMA synchronous=NORMAL");
-    } catch (...) {
+    } catch (const WorldError& e) {
       sqlite3_close_v2(db);
-      throw;
+      throw WorldError("cannot use the world database " + path + ": " + e.what());
     }
     db_ = db;
     path_ = path;
@@ -155,7 +156,7 @@ std::string DatabasePath() {
 
 std::unique_lock<std::mutex> LockWorld() { return std::unique_lock<std::mutex>(WorldMutex()); }
 
-OpenedDatabase OpenDatabase() { return TheHolder().Get(); }
+OpenedDatabase OpenDatabase(void (*check)(sqlite3*)) { return TheHolder().Get(check); }
 
 void ThrowSqlError(sqlite3* db, const std::string& what) {
   throw WorldError("world database error (" + what + "): " + sqlite3_errmsg(db));

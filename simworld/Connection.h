@@ -20,8 +20,10 @@ struct OpenedDatabase {
 };
 
 // The connection to DatabasePath(), opened on first use and opened again when
-// the path changes or the file at it was replaced. Needs the world lock.
-OpenedDatabase OpenDatabase();
+// the path changes or the file at it was replaced. A new connection is handed
+// to check before anything is changed in the file (it switches to WAL); when
+// check throws, the connection is dropped. Needs the world lock.
+OpenedDatabase OpenDatabase(void (*check)(sqlite3*));
 
 // Throws WorldError with what and SQLite's last error text.
 [[noreturn]] void ThrowSqlError(sqlite3* db, const std::string& what);

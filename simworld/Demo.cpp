@@ -38,7 +38,7 @@ const char* DemoScenario() {
         { "uuid": "5d2f7a10-6b1c-4e3d-9a8b-7c6d5e4f3a2b", "logicalSizeMB": 4096, "committedSizeMB": 128,
           "unsharedSizeMB": 64, "storageProfile": null, "blockSize": 4096, "metadata": [], "accessibility": 3,
           "configTarn": { "name": "vm-config-1", "policy": "", "vmUuid": "8a7b6c5d-4e3f-4a2b-9c1d-0e1f2a3b4c5d",
-                          "mounted": true } } ] },
+                          "mounted": false } } ] },
     { "name": "silver", "id": "9b8a7c6d-5e4f-4a3b-8c2d-1e0f9a8b7c6d", "vpUrl": "https://vp1.example.test:8443/kiro",
       "maxTarnSizeMB": 1048576, "arrays": ["array-a", "array-b"],
       "tarns": [

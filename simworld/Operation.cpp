@@ -16,7 +16,7 @@ sqlite3* checkedDb = nullptr;
 // The opened database, holding a world: the first use of an empty database
 // puts the demo world into it. Needs the world lock.
 sqlite3* ReadyDatabase(bool ensureWorld) {
-  const OpenedDatabase opened = OpenDatabase();
+  const OpenedDatabase opened = OpenDatabase(&RefuseForeignDatabase);
   if (opened.fresh) checkedDb = nullptr;
   if (ensureWorld && checkedDb != opened.db) {
     Transaction transaction(opened.db, true);

@@ -334,13 +334,20 @@ void SaveKiro(sqlite3* db, const std::optional<std::string>& context) {
   Statement(db, "INSERT INTO host VALUES(?)").Bind(1, context).Run();
 }
 
+// Answers whether the database holds any table; refuses one without a world.
+bool RequireWorldOrEmpty(sqlite3* db) {
+  Statement tables(db, "SELECT count(*), coalesce(sum(name = 'layout'), 0) FROM sqlite_master");
+  tables.Step();
+  if (tables.Int(0) > 0 && tables.Int(1) == 0) throw WorldError("it holds no Hyra world");
+  return tables.Int(0) > 0;
+}
+
 }  // namespace
 
+void RefuseForeignDatabase(sqlite3* db) { RequireWorldOrEmpty(db); }
+
 bool HasWorld(sqlite3* db) {
-  Statement tables(db, "SELECT count(*), sum(name = 'layout') FROM sqlite_master");
-  tables.Step();
-  if (tables.Int(0) == 0) return false;
-  if (tables.Int(1) == 0) throw WorldError("the database at " + DatabasePath() + " is no world");
+  if (!RequireWorldOrEmpty(db)) return false;
   Statement layout(db, "SELECT version FROM layout");
   const int64_t version = layout.Step() ? layout.Int(0) : -1;
   if (version != kLayoutVersion) {

@@ -9,6 +9,9 @@
 
 namespace HyraSim {
 
+// Refuses (with WorldError) a database that holds tables but no world, so
+// that nothing else is ever taken over.
+void RefuseForeignDatabase(sqlite3* db);
 // Answers true when the database holds a world of this layout; false when it
 // is empty. Throws WorldError for a database of another layout.
 bool HasWorld(sqlite3* db);

@@ -220,7 +220,7 @@ TEST_F(DaemonClient, ConfigTarnQueryListsInOrderAndFailedQueryStillAnswersAResul
   ASSERT_EQ(result->entryCount, 1);
   EXPECT_STREQ(result->entries[0]->tarnId, SimTest::kGoldConfigTarn);
   EXPECT_STREQ(result->entries[0]->name, "vm-config-1");
-  EXPECT_EQ(result->entries[0]->mounted, 1);
+  EXPECT_EQ(result->entries[0]->mounted, 0);
   TarnLib_FreeQueryResult(result);
 
   result = nullptr;

@@ -1,5 +1,6 @@
 // The scenario format through hyrasim and the world interface: round trips,
 // refusals that name the field, and the database file itself.
+#include <sqlite3.h>
 #include <sys/stat.h>
 
 #include <string>
@@ -167,6 +168,24 @@ TEST_F(Scenario, HyrasimRefusesWhatItCannotDo) {
   }
   EXPECT_EQ(Hyrasim("daemon stop").status, 0);
   EXPECT_EQ(World()["daemon"]["running"], false);
+}
+
+TEST_F(Scenario, FilesThatHoldNoWorldAreNeverTakenOver) {
+  sqlite3* db = nullptr;
+  ASSERT_EQ(sqlite3_open(Path("foreign.db").c_str(), &db), SQLITE_OK);
+  sqlite3_exec(db, "CREATE TABLE notes(text)", nullptr, nullptr, nullptr);
+  sqlite3_close(db);
+  WriteFile("text.db", "not a database\n");
+  for (const char* name : {"foreign.db", "text.db"}) {
+    const std::string before = ReadText(Path(name).string());
+    for (const char* command : {"show", "init --demo"}) {
+      const SimTest::ToolResult result =
+          Run("HYRA_SIM_DB=" + Path(name).string() + " " + HYRASIM_PATH, command);
+      EXPECT_EQ(result.status, 1) << name << " " << command;
+      EXPECT_NE(result.err.find(Path(name).string()), std::string::npos) << result.err;
+    }
+    EXPECT_EQ(ReadText(Path(name).string()), before) << name;
+  }
 }
 
 TEST_F(Scenario, SeveralProcessesWritingAtOnceLoseNothing) {

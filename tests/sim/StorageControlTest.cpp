@@ -136,6 +136,7 @@ TEST_F(StorageControl, ConfigTarnLifecycle) {
   gold->RemoveConfigTarn("vm-two", "", "", false);
   EXPECT_EQ(MessageOf([&] { gold->RemoveConfigTarn("vm-two", "", "", false); }),
             "No config-tarn named vm-two in gold");
+  gold->MountConfigTarn("vm-config-1", "", "", false);
   gold->RemoveConfigTarn("", SimTest::kGoldConfigTarn, "", false);  // mounted: goes as well
   EXPECT_EQ(World()["containers"][0]["tarns"].size(), 1u);
 }
