@@ -1,7 +1,6 @@
 // A command whose specifications and work are set by the test.
 #pragma once
 
-#include <boost/shared_ptr.hpp>
 #include <functional>
 #include <string>
 
@@ -9,59 +8,58 @@
 
 namespace FendleTest {
 
+using In = boost::shared_ptr<Fendle::CallSpec::Input>;
+using Out = boost::shared_ptr<Fendle::CallSpec::Output>;
+
 class TestCommand : public Fendle::AutoCli::Command {
  public:
-  typedef std::function<void(const boost::shared_ptr<Fendle::CallSpec::Input>&,
-                             const boost::shared_ptr<Fendle::CallSpec::Output>&)>
-      Body;
+  using Body = std::function<void(const In&, const Out&)>;
 
-  static boost::shared_ptr<TestCommand> New(const std::string& description = std::string()) {
+  // Without a body or spec the framework's defaults answer.
+  static boost::shared_ptr<TestCommand> New(
+      const std::string& description = "", const Body& body = nullptr,
+      const boost::shared_ptr<Fendle::CallSpec::InputSpec>& spec = nullptr) {
     boost::shared_ptr<TestCommand> command(new TestCommand());
     command->SetDescription(description);
+    command->body_ = body;
+    command->spec_ = spec;
     return command;
   }
-
-  // Without these the framework's defaults answer.
-  void SetInput(const boost::shared_ptr<Fendle::CallSpec::InputSpec>& spec) { input_ = spec; }
-  void SetOutput(const boost::shared_ptr<Fendle::CallSpec::OutputSpec>& spec) { output_ = spec; }
-  void SetBody(const Body& body) { body_ = body; }
-  int Runs() const { return runs_; }
+  int runs_ = 0;
 
  protected:
   boost::shared_ptr<Fendle::CallSpec::InputSpec> GetInputSpecInternal() override {
-    return input_ ? input_ : Command::GetInputSpecInternal();
+    return spec_ ? spec_ : Command::GetInputSpecInternal();
   }
-  boost::shared_ptr<Fendle::CallSpec::OutputSpec> GetOutputSpecInternal() override {
-    return output_ ? output_ : Command::GetOutputSpecInternal();
-  }
-  void ExecuteInternal(const boost::shared_ptr<Fendle::CallSpec::Input>& input,
-                       const boost::shared_ptr<Fendle::CallSpec::Output>& output) override {
+  void ExecuteInternal(const In& input, const Out& output) override {
     ++runs_;
-    if (body_) {
-      body_(input, output);
-    } else {
-      Command::ExecuteInternal(input, output);
-    }
+    body_ ? body_(input, output) : Command::ExecuteInternal(input, output);
   }
 
  private:
   TestCommand() = default;
-  boost::shared_ptr<Fendle::CallSpec::InputSpec> input_;
-  boost::shared_ptr<Fendle::CallSpec::OutputSpec> output_;
   Body body_;
-  int runs_ = 0;
+  boost::shared_ptr<Fendle::CallSpec::InputSpec> spec_;
 };
 
-// A parameter in one call.
-inline boost::shared_ptr<Fendle::CallSpec::ParameterSpec> Parameter(
-    const std::string& name, Fendle::CallSpec::ParameterType type, const std::string& alias,
-    bool required, const std::string& help = std::string()) {
-  boost::shared_ptr<Fendle::CallSpec::ParameterSpec> parameter =
-      Fendle::CallSpec::ParameterSpec::New(name, type);
-  if (!alias.empty()) parameter->SetAlias(alias);
-  parameter->SetHelp(help);
-  parameter->SetRequired(required);
-  return parameter;
+// An InputSpec from (name, type, alias, required, help) rows.
+struct Row {
+  std::string name;
+  Fendle::CallSpec::ParameterType type;
+  std::string alias;
+  bool required;
+  std::string help;
+};
+inline boost::shared_ptr<Fendle::CallSpec::InputSpec> Spec(const std::vector<Row>& rows) {
+  boost::shared_ptr<Fendle::CallSpec::InputSpec> spec = Fendle::CallSpec::InputSpec::New();
+  for (const Row& row : rows) {
+    auto parameter = Fendle::CallSpec::ParameterSpec::New(row.name, row.type);
+    if (!row.alias.empty()) parameter->SetAlias(row.alias);
+    parameter->SetHelp(row.help);
+    parameter->SetRequired(row.required);
+    spec->AddParameter(parameter);
+  }
+  return spec;
 }
 
 }  // namespace FendleTest

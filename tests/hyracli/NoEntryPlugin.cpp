@@ -1,2 +1,0 @@
-// A library in the plug-in directory that lacks the registration entry.
-extern "C" int HyracliTestNotAnEntry() { return 0; }
