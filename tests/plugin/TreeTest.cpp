@@ -3,39 +3,15 @@
 #include <functional>
 #include <sstream>
 
-#include "CGAdd.h"
-#include "ConfigTarnAdd.h"
-#include "ConfigTarnMountdir.h"
-#include "ConfigTarnRemove.h"
-#include "ConfigTarnUmountdir.h"
-#include "DaemonCommand.h"
-#include "FaultInjectionEnable.h"
-#include "FaultInjectionRuleAdd.h"
-#include "FaultInjectionRuleRemove.h"
-#include "FaultInjectionRuleSet.h"
 #include "HostCtl/Lib.h"
-#include "KiroContextSet.h"
 #include "OskCtl/Lib.h"
 #include "PluginTestSupport.h"
-#include "StorageContainerAdd.h"
-#include "StorageContainerCheckTarns.h"
-#include "StorageContainerLoad.h"
-#include "StorageContainerRemove.h"
 #include "TarnLibSim.h"
 #include "TarnNamespace.h"
-#include "VendorProviderActivate.h"
-#include "VendorProviderAdd.h"
-#include "VendorProviderDeactivate.h"
-#include "VendorProviderInjectFault.h"
-#include "VendorProviderRemove.h"
-#include "VendorProviderSet.h"
-#include "VirtualVolumeGet.h"
-#include "VirtualVolumeMetaDataList.h"
 
 namespace PluginTest {
 namespace {
 
-using namespace HalvikCli::TarnNamespace;
 using Fendle::AutoCli::Command;
 using Fendle::AutoCli::Namespace;
 using Fendle::AutoCli::NamespaceNode;
@@ -96,138 +72,28 @@ NodePtr Resolve(const NodePtr& from, const std::string& path) {
   return node;
 }
 
-template <typename T>
-bool IsA(const NodePtr& node) {
-  return boost::dynamic_pointer_cast<T>(node) != nullptr;
-}
+class TreeTest : public SimWorldTest {};
 
-class TreeTest : public SimWorldTest {
- protected:
-  // Registers into a fresh root holding `storage`; answers `storage internal`.
-  NodePtr RegisterAll() {
-    root_ = RootWithStorage(Namespace::New());
-    AutoCli_RegisterNamespaces(root_);
-    return Resolve(root_, "storage internal");
-  }
-  NamespacePtr root_;
-};
-
-TEST_F(TreeTest, NamespacesHoldTheirChildrenInRegistrationOrderWithTheirDescriptions) {
-  struct Case {
-    const char* path;
-    std::vector<std::string> children;
-    const char* description;
-  };
-  const Case cases[] = {
-      {"", {"internal"}, nullptr},
-      {"internal", {"tarn"}, "Halvik internal storage commands."},
-      {"internal tarn",
-       {"kiroprovider", "faultInjection", "storagecontainer", "configtarn", "daemon", "kirocontext",
-        "virtualvolume"},
-       "Operations pertaining to Virtual Volumes"},
-      {"internal tarn kiroprovider",
-       {"add", "set", "remove", "activate", "deactivate", "injectfault"},
-       "Manage Tarn Kiro Provider Operations."},
-      {"internal tarn faultInjection", {"enable", "rule"}, "Manage fault injection."},
-      {"internal tarn faultInjection rule", {"add", "set", "remove"}, ""},
-      {"internal tarn storagecontainer",
-       {"load", "add", "remove", "checktarns"},
-       "Operations to create, manage, remove and restore Tarn StorageContainers."},
-      {"internal tarn configtarn",
-       {"add", "remove", "umount", "mount"},
-       "Operations pertaining to config-tarns."},
-      {"internal tarn daemon",
-       {"set"},
-       "Operations pertaining to Tarn daemon to  set LogLevel,unbind timer and dump objects."},
-      {"internal tarn kirocontext", {"set"}, "Operations on the Tarn Kiro context."},
-      {"internal tarn virtualvolume",
-       {"get", "metadata"},
-       "Operations on a specific virtual volume."},
-      {"internal tarn virtualvolume metadata",
-       {"list"},
-       "Operations on the metadata for a specific virtual volume."},
-  };
-  RegisterAll();
-  const NodePtr storage = Resolve(root_, "storage");
-  for (const Case& c : cases) {
-    SCOPED_TRACE(c.path);
-    const NodePtr node = Resolve(storage, c.path);
-    ASSERT_TRUE(IsA<Namespace>(node));
-    EXPECT_EQ(node->GetNamespaceNodeNames(), c.children);
-    if (c.description) {
-      EXPECT_EQ(node->GetDescription(), c.description);
-    }
-  }
-}
-
-TEST_F(TreeTest, EachOfTheTwentyTwoCommandsIsItsClassAtItsPath) {
-  struct Case {
-    const char* path;
-    std::function<bool(const NodePtr&)> isExpectedClass;
-  };
-  const Case cases[] = {
-      {"kiroprovider add", IsA<VendorProviderAdd>},
-      {"kiroprovider set", IsA<VendorProviderSet>},
-      {"kiroprovider remove", IsA<VendorProviderRemove>},
-      {"kiroprovider activate", IsA<VendorProviderActivate>},
-      {"kiroprovider deactivate", IsA<VendorProviderDeactivate>},
-      {"kiroprovider injectfault", IsA<VendorProviderInjectFault>},
-      {"faultInjection enable", IsA<FaultInjectionEnable>},
-      {"faultInjection rule add", IsA<FaultInjectionRuleAdd>},
-      {"faultInjection rule set", IsA<FaultInjectionRuleSet>},
-      {"faultInjection rule remove", IsA<FaultInjectionRuleRemove>},
-      {"storagecontainer load", IsA<StorageContainerLoad>},
-      {"storagecontainer add", IsA<StorageContainerAdd>},
-      {"storagecontainer remove", IsA<StorageContainerRemove>},
-      {"storagecontainer checktarns", IsA<StorageContainerCheckTarns>},
-      {"configtarn add", IsA<ConfigTarnAdd>},
-      {"configtarn remove", IsA<ConfigTarnRemove>},
-      {"configtarn umount", IsA<ConfigTarnUmountdir>},
-      {"configtarn mount", IsA<ConfigTarnMountdir>},
-      {"daemon set", IsA<DaemonCommand>},
-      {"kirocontext set", IsA<KiroContextSet>},
-      {"virtualvolume get", IsA<VirtualVolumeGet>},
-      {"virtualvolume metadata list", IsA<VirtualVolumeMetaDataList>},
-  };
-  NodePtr tarn = Resolve(RegisterAll(), "tarn");
-  for (const Case& c : cases) {
-    SCOPED_TRACE(c.path);
-    EXPECT_TRUE(c.isExpectedClass(Resolve(tarn, c.path)));
-  }
-  EXPECT_EQ(WatchingNamespace::CountCommands(tarn), 22);
-  // Seven commands hold the daemon client library while the tree lives.
-  EXPECT_EQ(TarnLibSim_Openings(), 7);
-  tarn.reset();
-  root_.reset();
-  EXPECT_EQ(TarnLibSim_Openings(), 0);
-}
-
-TEST_F(TreeTest, TarnIsHungUnderInternalLastAndComplete) {
-  boost::shared_ptr<WatchingNamespace> storage = WatchingNamespace::New();
-  boost::shared_ptr<WatchingNamespace> internal = WatchingNamespace::New();
-  NamespacePtr root = RootWithStorage(storage);
-  storage->RegisterNamespaceNode(internal, "internal");
-  storage->registrations.clear();
-
-  AutoCli_RegisterNamespaces(root);
-
-  EXPECT_TRUE(storage->registrations.empty());
-  ASSERT_EQ(internal->registrations.size(), 1u);
-  EXPECT_EQ(internal->registrations[0].name, "tarn");
-  EXPECT_EQ(internal->registrations[0].commandsBelow, 22);
-  EXPECT_EQ(internal->registrations[0].initCallsBefore, 7);
-}
-
-TEST_F(TreeTest, NewInternalIsRegisteredBeforeAnyCommandIsCreated) {
+TEST_F(TreeTest, NewInternalComesFirstAndTarnLastWithAllItsCommands) {
+  // No internal yet: it is registered before any command is built.
   boost::shared_ptr<WatchingNamespace> storage = WatchingNamespace::New();
   NamespacePtr root = RootWithStorage(storage);
-
   AutoCli_RegisterNamespaces(root);
-
   ASSERT_EQ(storage->registrations.size(), 1u);
   EXPECT_EQ(storage->registrations[0].name, "internal");
   EXPECT_EQ(storage->registrations[0].commandsBelow, 0);
   EXPECT_EQ(storage->registrations[0].initCallsBefore, 0);
+
+  // tarn shows up only once it holds all 22 commands.
+  TarnLibSim_ResetCounters();
+  boost::shared_ptr<WatchingNamespace> internal = WatchingNamespace::New();
+  root = RootWithStorage(Namespace::New());
+  Resolve(root, "storage")->RegisterNamespaceNode(internal, "internal");
+  AutoCli_RegisterNamespaces(root);
+  ASSERT_EQ(internal->registrations.size(), 1u);
+  EXPECT_EQ(internal->registrations[0].name, "tarn");
+  EXPECT_EQ(internal->registrations[0].commandsBelow, 22);
+  EXPECT_EQ(internal->registrations[0].initCallsBefore, 7);
 }
 
 TEST_F(TreeTest, ExistingInternalIsReusedWithItsDescription) {
