@@ -85,7 +85,7 @@ std::string Command::GenerateHelpOutput() {
   // Descriptions and help texts are written exactly as declared: some carry
   // deliberate blanks, quotes or line feeds that a reader may need to see.
   std::ostringstream help;
-  // Held here: the parameters belong to the spec, which may be made afresh per call.
+  // Held here: the parameters belong to the input specification, which may be made per call.
   boost::shared_ptr<CallSpec::InputSpec> spec = GetInputSpec();
   const std::vector<boost::shared_ptr<CallSpec::ParameterSpec> >& parameters =
       spec->GetParameters();

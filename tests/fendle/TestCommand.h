@@ -15,7 +15,7 @@ class TestCommand : public Fendle::AutoCli::Command {
  public:
   using Body = std::function<void(const In&, const Out&)>;
 
-  // Without a body or spec the framework's defaults answer.
+  // Without a body or an input specification the framework's defaults answer.
   static boost::shared_ptr<TestCommand> New(
       const std::string& description = "", const Body& body = nullptr,
       const boost::shared_ptr<Fendle::CallSpec::InputSpec>& spec = nullptr) {

@@ -96,7 +96,7 @@ TEST_F(HyraCliTest, StatusAndStreamsOfEveryOutcome) {
       // Help, wherever it is asked.
       {{"storage", "test", "act", "--help"}, std::string("0|") + kActHelp + "|"},
       {{"--help", "storage", "test", "act", "-d", "x"}, std::string("0|") + kActHelp + "|"},
-      // A spec made afresh for the help must live while the help is written.
+      // An input specification made per call must live while the help is written.
       {{"storage", "test", "idle", "--help"},
        "0|Usage: hyracli storage test idle\n\nOptions: none\n|"},
       {{"storage", "--help", "test"}, std::string("0|") + kTestList + "|"},

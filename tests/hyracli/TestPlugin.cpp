@@ -1,6 +1,6 @@
-// The plug-ins of the end-to-end tests, one source built as four parts:
+// The plug-ins of the end-to-end tests, one source built in four variants:
 //   1  creates "storage sample" with "hello"
-//   2  adds "bye" to "storage sample", so it needs part 1 loaded first
+//   2  adds "bye" to "storage sample", so it needs variant 1 loaded first
 //   3  hangs "leftover" into the tree, then fails as when tarnLib cannot open
 //   4  has no entry at all
 #include <boost/pointer_cast.hpp>
@@ -38,15 +38,15 @@ class Greeting : public Fendle::AutoCli::Command {
 
 }  // namespace
 
-#if PART != 4
+#if VARIANT != 4
 extern "C" void AutoCli_RegisterNamespaces(boost::shared_ptr<Fendle::AutoCli::Namespace>& root) {
   auto storage = root->GetNamespaceNode("storage");
-#if PART == 1
+#if VARIANT == 1
   auto sample = Fendle::AutoCli::Namespace::New();
   sample->SetDescription("Sample commands.");
   sample->RegisterNamespaceNode(Greeting::New("Hello"), "hello");
   storage->RegisterNamespaceNode(sample, "sample");
-#elif PART == 2
+#elif VARIANT == 2
   auto sample = storage->GetNamespaceNode("sample");
   if (!sample) throw HostCtl::Lib::HostCtlException("no 'sample' namespace", {});
   sample->RegisterNamespaceNode(Greeting::New("Bye"), "bye");
