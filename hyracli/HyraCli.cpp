@@ -154,6 +154,18 @@ int RunCommand(Command& command, const std::vector<std::string>& args,
   return kExitOk;
 }
 
+// Fills options; false after reporting a usage error.
+bool ParseOrReport(const std::vector<std::string>& args, GlobalOptions& options,
+                   std::ostream& err) {
+  try {
+    options = ParseGlobalOptions(args);
+  } catch (const UsageError& e) {
+    ReportUsage(err, e.what(), kTool);
+    return false;
+  }
+  return true;
+}
+
 }  // namespace
 
 GlobalOptions ParseGlobalOptions(const std::vector<std::string>& args) {
@@ -251,21 +263,13 @@ int Dispatch(const GlobalOptions& options, const boost::shared_ptr<NamespaceNode
 int Run(const std::vector<std::string>& args, const boost::shared_ptr<NamespaceNode>& root,
         std::ostream& out, std::ostream& err) {
   GlobalOptions options;
-  try {
-    options = ParseGlobalOptions(args);
-  } catch (const UsageError& e) {
-    return ReportUsage(err, e.what(), kTool);
-  }
+  if (!ParseOrReport(args, options, err)) return kExitUsage;
   return Dispatch(options, root, out, err);
 }
 
 int Main(const std::vector<std::string>& args, std::ostream& out, std::ostream& err) {
   GlobalOptions options;
-  try {
-    options = ParseGlobalOptions(args);
-  } catch (const UsageError& e) {
-    return ReportUsage(err, e.what(), kTool);
-  }
+  if (!ParseOrReport(args, options, err)) return kExitUsage;
   // Declared before the tree so that it is destroyed after it: command objects
   // must die while the libraries holding their code are still loaded.
   PluginLoader loader;
