@@ -70,6 +70,8 @@ Injection ConsumeCall(sqlite3* db, const std::string& operation) {
   Statement row(db, "SELECT message, after, times, answer_null FROM failure WHERE operation = ?");
   row.Bind(1, operation);
   if (!row.Step()) return {};
+  // Read the whole row before the arming is changed under the statement.
+  const Injection injection{true, row.Int(3) != 0, row.Text(0)};
   const int64_t after = row.Int(1);
   const int64_t times = row.Int(2);
   if (after > 0) {
@@ -85,7 +87,7 @@ Injection ConsumeCall(sqlite3* db, const std::string& operation) {
         .Bind(1, operation)
         .Run();
   }
-  return {true, row.Int(3) != 0, row.Text(0)};
+  return injection;
 }
 
 void StoreArming(sqlite3* db, const std::string& operation, const FailureSpec& spec) {
