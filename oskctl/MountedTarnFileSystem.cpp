@@ -1,6 +1,5 @@
 #include "MountedTarnFileSystem.h"
 
-#include <cstring>
 #include <random>
 
 #include "ContainerId.h"
@@ -57,23 +56,19 @@ bool MountedTarnFileSystem::MatchesContainerId(const std::string& id) const {
 
 std::vector<HostCtl::Storage::TarnAccessibilityType> MountedTarnFileSystem::CheckTarnAccessibility(
     const std::vector<std::string>& tarnIds) {
-  std::vector<int32_t> states;
-  const bool ran = RunHostOperation("CheckTarnAccessibility", Access::kRead, [&](WorldState& w) {
+  std::vector<HostCtl::Storage::TarnAccessibilityType> states;
+  RunHostOperation("CheckTarnAccessibility", Access::kRead, [&](WorldState& w) {
     Container* container = w.ContainerMatching(id_);
     for (const std::string& id : tarnIds) {
       const Tarn* tarn = container != nullptr ? HyraSim::FindTarn(*container, id) : nullptr;
-      states.push_back(tarn != nullptr ? tarn->accessibility : HostCtl::Storage::TARN_NON_EXISTENT);
+      // A world may hold any 32-bit state; the enumeration's fixed type keeps it.
+      states.push_back(tarn != nullptr
+                           ? static_cast<HostCtl::Storage::TarnAccessibilityType>(tarn->accessibility)
+                           : HostCtl::Storage::TARN_NON_EXISTENT);
     }
     return 0u;
   });
-  std::vector<HostCtl::Storage::TarnAccessibilityType> answer;
-  if (!ran) return answer;
-  // A stored state may lie outside the enumeration (a world can hold any
-  // number); copy the bits rather than convert, which would be undefined.
-  answer.resize(states.size());
-  static_assert(sizeof(HostCtl::Storage::TarnAccessibilityType) == sizeof(int32_t), "state size");
-  if (!states.empty()) std::memcpy(answer.data(), states.data(), states.size() * sizeof(int32_t));
-  return answer;
+  return states;  // empty when the operation is armed to answer nothing
 }
 
 Container& MountedTarnFileSystem::DaemonContainer(WorldState& world) const {

@@ -25,10 +25,11 @@ struct VendorProviderInfo {
 
 // The start (0) or the end (1) of an all-paths-down (APD) condition of a
 // protocol endpoint.
-enum ProtocolEndPointEvent { PE_APD_START = 0, PE_APD_END = 1 };
+enum ProtocolEndPointEvent : int32_t { PE_APD_START = 0, PE_APD_END = 1 };
 
-// Whether the host can reach a tarn of a container.
-enum TarnAccessibilityType {
+// Whether the host can reach a tarn of a container. The fixed 32-bit type lets
+// a host answer a state this list does not name.
+enum TarnAccessibilityType : int32_t {
   TARN_NON_EXISTENT = 0,
   TARN_UNCONFIRMED = 1,
   TARN_INACCESSIBLE = 2,
