@@ -97,6 +97,12 @@ int Daemon(const Args& args) {
   return 0;
 }
 
+// "1 call passes", "3 calls pass": count calls with the verb agreeing.
+std::string Calls(int64_t count, const char* singular, const char* plural) {
+  return std::to_string(count) + (count == 1 ? " call " : " calls ") +
+         (count == 1 ? singular : plural);
+}
+
 int Fail(const Args& args) {
   Expect(!args.empty(), "fail needs an OPERATION, --clear or --list");
   if (args[0] == "--clear" || args[0] == "--list") {
@@ -128,8 +134,10 @@ int Fail(const Args& args) {
     }
   }
   HyraSim::ArmFailure(args[0], spec);
-  std::cout << args[0] << " is armed: " << spec.after << " calls pass, then " << spec.times
-            << (spec.null ? " answer nothing.\n" : " fail.\n");
+  std::cout << args[0] << " is armed: " << Calls(spec.after, "passes", "pass") << ", then "
+            << (spec.null ? Calls(spec.times, "answers nothing", "answer nothing")
+                          : Calls(spec.times, "fails", "fail"))
+            << ".\n";
   return 0;
 }
 
