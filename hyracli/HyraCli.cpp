@@ -35,6 +35,11 @@ int ReportUsage(std::ostream& err, const std::string& message, const std::string
   return kExitUsage;
 }
 
+// Writes the error texts the command reported, in order.
+void WriteErrors(const Fendle::CallSpec::Output& output, std::ostream& err) {
+  for (const std::string& error : output.GetErrors()) WriteMessage(err, error);
+}
+
 // Reports the exception in flight that left a command; never rethrows.
 int ReportCommandException(std::ostream& err) {
   std::string message;
@@ -123,12 +128,14 @@ int RunCommand(Command& command, const std::vector<std::string>& args,
     outputSpec = command.GetOutputSpec();
     command.Execute(input, output);
   } catch (...) {
+    // What the command reported before the exception left it is not lost.
+    WriteErrors(*output, err);
     return ReportCommandException(err);
   }
 
   // An error wins over any result the command also set: nothing on standard output.
   if (output->HasError()) {
-    for (const std::string& error : output->GetErrors()) WriteMessage(err, error);
+    WriteErrors(*output, err);
     return kExitCommandFailed;
   }
   if (!output->IsFinished()) {

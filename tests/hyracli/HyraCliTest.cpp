@@ -25,6 +25,10 @@ void Act(const In& in, const Out& out) {
                                        HostCtl::Lib::KelmMessage());
   }
   if (what == "other") throw 42;
+  if (what == "half") {
+    out->SetError("reported first");
+    throw HostCtl::Lib::HostCtlException("then thrown", HostCtl::Lib::KelmMessage());
+  }
   if (what == "fail") {
     out->SetError("first");
     out->SetError("second\n");
@@ -110,6 +114,7 @@ TEST_F(HyraCliTest, StatusAndStreamsOfEveryOutcome) {
       {{"storage", "test", "act", "-d", "osk"}, "1||hyracli: Unable to initialize tarnLib\n"},
       {{"storage", "test", "act", "-d", "other"},
        "1||hyracli: the command failed with an unknown exception\n"},
+      {{"storage", "test", "act", "-d", "half"}, "1||reported first\nhyracli: then thrown\n"},
       // Usage errors, found before the command runs.
       {{"storage", "nope"},
        "2||hyracli: Unknown namespace or command 'nope' in 'hyracli storage'\n"
@@ -129,7 +134,7 @@ TEST_F(HyraCliTest, StatusAndStreamsOfEveryOutcome) {
   };
   for (const auto& c : cases) EXPECT_EQ(RunTool(root_, c.first), c.second);
   // Once per run of "act" above: help and usage errors never ran it.
-  EXPECT_EQ(act_->runs_, 9);
+  EXPECT_EQ(act_->runs_, 10);
 }
 
 }  // namespace
