@@ -113,6 +113,22 @@ boost::shared_ptr<CallSpec::Input> ArgumentParser::Parse(
   return input;
 }
 
+bool ArgumentParser::AsksForHelp(const std::vector<std::string>& words) const {
+  for (std::size_t at = 0; at < words.size(); ++at) {
+    const std::string& word = words[at];
+    if (word == "--help") return true;
+    boost::shared_ptr<ParameterSpec> parameter;
+    if (word.size() > 2 && word.compare(0, 2, "--") == 0) {
+      if (word.find('=') != std::string::npos) continue;
+      parameter = spec_->FindParameter(word.substr(2));
+    } else if (word.size() > 1 && word[0] == '-' && word[1] != '-') {
+      parameter = spec_->FindAlias(word.substr(1));
+    }
+    if (parameter && parameter->GetType() != ParameterType::Flag) ++at;  // skip its value
+  }
+  return false;
+}
+
 void ArgumentParser::Store(const ParameterSpec& parameter, const std::string& value,
                            CallSpec::Input& input) const {
   const std::string& name = parameter.GetName();

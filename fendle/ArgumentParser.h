@@ -27,6 +27,10 @@ class ArgumentParser {
   // value, a single-valued option given twice or a missing required option.
   boost::shared_ptr<CallSpec::Input> Parse(const std::vector<std::string>& words) const;
 
+  // True when "--help" stands where an option is expected, not where it is
+  // the value of the option before it ("-v --help" names something --help).
+  bool AsksForHelp(const std::vector<std::string>& words) const;
+
  private:
   // Stores one value of parameter, converted to its type.
   void Store(const CallSpec::ParameterSpec& parameter, const std::string& value,

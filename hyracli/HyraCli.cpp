@@ -227,16 +227,23 @@ boost::shared_ptr<Namespace> NewRootNamespace() {
 
 int Dispatch(const GlobalOptions& options, const boost::shared_ptr<NamespaceNode>& root,
              std::ostream& out, std::ostream& err) {
-  bool help = options.help;
+  // "--help" anywhere among the words of the path asks for help.
   std::vector<std::string> words;
   for (const std::string& word : options.words) {
-    if (word == "--help") {
+    if (word != "--help") words.push_back(word);
+  }
+  const std::size_t unresolved = words.size();
+  boost::shared_ptr<NamespaceNode> node = root->ResolveNode(words);
+  std::size_t pathWords = unresolved - words.size();
+  bool help = options.help;
+  std::size_t at = 0;
+  for (; at < options.words.size() && (pathWords > 0 || options.words[at] == "--help"); ++at) {
+    if (options.words[at] == "--help") {
       help = true;
     } else {
-      words.push_back(word);
+      --pathWords;
     }
   }
-  boost::shared_ptr<NamespaceNode> node = root->ResolveNode(words);
   if (node->GetType() == NodeType::Command) {
     boost::shared_ptr<Command> command = boost::dynamic_pointer_cast<Command>(node);
     if (!command) {
@@ -244,9 +251,15 @@ int Dispatch(const GlobalOptions& options, const boost::shared_ptr<NamespaceNode
                             "' is marked as a command but cannot be run");
       return kExitCommandFailed;
     }
-    if (!help) return RunCommand(*command, words, options.formatter, out, err);
+    // After the path, "--help" counts only where an option is expected.
+    const std::vector<std::string> arguments(
+        options.words.begin() + static_cast<std::ptrdiff_t>(at), options.words.end());
     std::string text;
     try {
+      if (!help) {
+        help = Fendle::CommandLine::ArgumentParser(command->GetInputSpec()).AsksForHelp(arguments);
+      }
+      if (!help) return RunCommand(*command, arguments, options.formatter, out, err);
       text = command->GenerateHelpOutput();
     } catch (...) {
       return ReportCommandException(err);

@@ -100,6 +100,10 @@ TEST_F(HyraCliTest, StatusAndStreamsOfEveryOutcome) {
       // Help, wherever it is asked.
       {{"storage", "test", "act", "--help"}, std::string("0|") + kActHelp + "|"},
       {{"--help", "storage", "test", "act", "-d", "x"}, std::string("0|") + kActHelp + "|"},
+      {{"storage", "test", "act", "-d", "x", "--help"}, std::string("0|") + kActHelp + "|"},
+      // ... but not where it is an option's value.
+      {{"storage", "test", "act", "-d", "--help"}, "0|--help\n|"},
+      {{"storage", "test", "act", "--tag", "--help", "-d", "x"}, "0|x\n|"},
       // An input specification made per call must live while the help is written.
       {{"storage", "test", "idle", "--help"},
        "0|Usage: hyracli storage test idle\n\nOptions: none\n|"},
@@ -134,7 +138,7 @@ TEST_F(HyraCliTest, StatusAndStreamsOfEveryOutcome) {
   };
   for (const auto& c : cases) EXPECT_EQ(RunTool(root_, c.first), c.second);
   // Once per run of "act" above: help and usage errors never ran it.
-  EXPECT_EQ(act_->runs_, 10);
+  EXPECT_EQ(act_->runs_, 12);
 }
 
 }  // namespace
