@@ -110,8 +110,13 @@ void FreeArray(StorageArrayRecord* array) {
   free(array);
 }
 
+// A text longer than the record holds is cut before a whole character, never
+// inside a multi-byte UTF-8 sequence.
 void FillErrorText(TarnLib_ErrorEx& error, const std::string& text) {
-  const size_t length = std::min(text.size(), sizeof(error.text) - 1);
+  size_t length = std::min(text.size(), sizeof(error.text) - 1);
+  if (length < text.size()) {
+    while (length > 0 && (static_cast<unsigned char>(text[length]) & 0xC0) == 0x80) --length;
+  }
   std::memcpy(error.text, text.data(), length);
   error.text[length] = '\0';
 }

@@ -88,6 +88,12 @@ TEST_F(Failures, DaemonCallsFailWithTheInjectedText) {
   EXPECT_FALSE(TarnLib_ErrorExIsSuccess(&error));
   EXPECT_STREQ(TarnLib_ErrorExStr(&error), "no route to Tarnd");
   EXPECT_EQ(result, nullptr);
+  // A text longer than the record is cut before a whole character: 254 bytes
+  // and a two-byte character would otherwise end on half of it.
+  const std::string longText = std::string(254, 'x') + "\xC3\xA9" + "tail";
+  HyraSim::ArmFailure("TarnLib_GetStorageContainer", Spec(longText, 0, 1, false));
+  const TarnLib_ErrorEx cut = TarnLib_GetStorageContainer(1, nullptr, &result);
+  EXPECT_EQ(std::string(TarnLib_ErrorExStr(&cut)), std::string(254, 'x'));
 
   HyraSim::ArmFailure("TarnLib_Init", Spec("x", 0, 1, false));
   EXPECT_FALSE(TarnLib_Init(0, 0));
