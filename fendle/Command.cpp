@@ -125,7 +125,9 @@ boost::shared_ptr<CallSpec::OutputSpec> Command::GetOutputSpecInternal() {
 void Command::ExecuteInternal(const boost::shared_ptr<CallSpec::Input>& /*input*/,
                               const boost::shared_ptr<CallSpec::Output>& output) {
   std::string path = GetPathString(' ');
-  output->SetError("The command '" + (path.empty() ? GetName() : path) + "' is not implemented.");
+  const std::string name = path.empty() ? GetName() : path;
+  output->SetError(name.empty() ? "This command is not implemented."
+                                : "The command '" + name + "' is not implemented.");
 }
 
 }  // namespace AutoCli
