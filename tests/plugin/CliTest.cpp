@@ -1,85 +1,14 @@
-// The kiroprovider commands end to end: hyracli with the plug-in beside it,
-// against a world that hyrasim sets up, arms and shows.
-#include <gtest/gtest.h>
-#include <sys/wait.h>
-
-#include <cstdio>
-#include <cstdlib>
-#include <filesystem>
-#include <fstream>
+// The kiroprovider commands end to end.
 #include <nlohmann/json.hpp>
-#include <sstream>
 #include <string>
 #include <vector>
 
+#include "CliSupport.h"
+
+namespace PluginCliTest {
 namespace {
 
 using nlohmann::json;
-
-struct Outcome {
-  int status;
-  std::string out;
-  std::string err;
-};
-
-bool operator==(const Outcome& a, const Outcome& b) {
-  return a.status == b.status && a.out == b.out && a.err == b.err;
-}
-
-std::ostream& operator<<(std::ostream& os, const Outcome& o) {
-  return os << "status " << o.status << ", out \"" << o.out << "\", err \"" << o.err << "\"";
-}
-
-std::string Quoted(const std::string& word) {
-  std::string quoted = "'";
-  for (char c : word) quoted += (c == '\'') ? std::string("'\\''") : std::string(1, c);
-  return quoted + "'";
-}
-
-class CliTest : public ::testing::Test {
- protected:
-  void SetUp() override {
-    std::string pattern = (std::filesystem::temp_directory_path() / "plugin-cli-XXXXXX").string();
-    ASSERT_NE(mkdtemp(pattern.data()), nullptr);
-    directory_ = pattern;
-    setenv("HYRA_SIM_DB", (directory_ + "/world.db").c_str(), 1);
-    ASSERT_EQ(Sim({"init", "--demo"}).status, 0);
-  }
-  void TearDown() override {
-    unsetenv("HYRA_SIM_DB");
-    std::error_code ignored;
-    std::filesystem::remove_all(directory_, ignored);
-  }
-
-  Outcome Tool(const char* path, const std::vector<std::string>& args) {
-    const std::string errPath = directory_ + "/stderr";
-    std::string command = Quoted(path);
-    for (const auto& arg : args) command += " " + Quoted(arg);
-    command += " 2>" + Quoted(errPath);
-    Outcome outcome{-1, "", ""};
-    FILE* pipe = popen(command.c_str(), "r");
-    if (pipe == nullptr) return outcome;
-    char buffer[4096];
-    for (size_t n; (n = fread(buffer, 1, sizeof buffer, pipe)) > 0;) outcome.out.append(buffer, n);
-    const int status = pclose(pipe);
-    outcome.status = WIFEXITED(status) ? WEXITSTATUS(status) : -1;
-    std::ifstream err(errPath);
-    std::ostringstream text;
-    text << err.rdbuf();
-    outcome.err = text.str();
-    return outcome;
-  }
-
-  // hyracli storage internal tarn kiroprovider <args>
-  Outcome Provider(std::vector<std::string> args) {
-    args.insert(args.begin(), {"storage", "internal", "tarn", "kiroprovider"});
-    return Tool(HYRACLI_PATH, args);
-  }
-  Outcome Sim(const std::vector<std::string>& args) { return Tool(HYRASIM_PATH, args); }
-  json World() { return json::parse(Sim({"show", "--json"}).out); }
-
-  std::string directory_;
-};
 
 TEST_F(CliTest, ProviderLifecycleLeavesExactlyWhatEachCommandStored) {
   struct Step {
@@ -158,3 +87,4 @@ TEST_F(CliTest, StoppedDaemonKeepsThePluginFromRegistering) {
 }
 
 }  // namespace
+}  // namespace PluginCliTest
