@@ -1,5 +1,6 @@
 #include "CGAdd.h"
 
+#include "CommandEndings.h"
 #include "CommandSpecs.h"
 #include "ParameterNames.h"
 #include "TarnLib/TarnLib.h"
@@ -40,6 +41,15 @@ boost::shared_ptr<Fendle::CallSpec::InputSpec> CGAdd::GetInputSpecInternal() {
 
 boost::shared_ptr<Fendle::CallSpec::OutputSpec> CGAdd::GetOutputSpecInternal() {
   return DeclareResult(Fendle::MetaObj::MetaBool::New());
+}
+
+void CGAdd::ExecuteInternal(const boost::shared_ptr<Fendle::CallSpec::Input>& input,
+                            const boost::shared_ptr<Fendle::CallSpec::Output>& output) {
+  // Read but not used yet: no library answers group requests.
+  input->GetString(kCgId);
+  input->GetStringList(kTarnIds);
+  input->GetString(kVpName);
+  EndWithTrue(output);
 }
 
 }  // namespace TarnNamespace

@@ -1,6 +1,11 @@
 #include "CGCreate.h"
 
+#include <string>
+#include <vector>
+
+#include "CommandEndings.h"
 #include "CommandSpecs.h"
+#include "GroupListing.h"
 #include "ParameterNames.h"
 #include "TarnLib/TarnLib.h"
 #include "TarnLibBracket.h"
@@ -49,6 +54,25 @@ boost::shared_ptr<Fendle::CallSpec::OutputSpec> CGCreate::GetOutputSpecInternal(
 boost::shared_ptr<Fendle::MetaObj::MetaStruct> CGCreate::GetOutputStructure() {
   return NewTextStruct("CGCreate", {"Name", "Description", "Id", "DestinationArrayId",
                                     "FailoverArrayId", "SourceArrayId", "State"});
+}
+
+void CGCreate::ExecuteInternal(const boost::shared_ptr<Fendle::CallSpec::Input>& input,
+                               const boost::shared_ptr<Fendle::CallSpec::Output>& output) {
+  // Read but not used yet: no library answers group requests.
+  input->GetString(kName);
+  input->GetString(kDesc);
+  input->GetString(kProfile);
+  input->GetString(kVpName);
+  const TryInvocationBracket bracket;
+  if (!bracket.IsOpen()) {
+    EndWithError(output, kFailedToInitializeTarnLib);
+    return;
+  }
+  const boost::shared_ptr<Fendle::MetaObj::MetaStruct> row = GetOutputStructure();
+  std::vector<std::string> fields;
+  for (const auto& field : row->GetFields()) fields.push_back(field.first);
+  for (const std::string& field : fields) row->SetField(field, std::string());
+  EndWithResult(output, row);
 }
 
 }  // namespace TarnNamespace

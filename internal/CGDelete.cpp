@@ -1,5 +1,6 @@
 #include "CGDelete.h"
 
+#include "CommandEndings.h"
 #include "CommandSpecs.h"
 #include "ParameterNames.h"
 #include "TarnLib/TarnLib.h"
@@ -38,6 +39,14 @@ boost::shared_ptr<Fendle::CallSpec::InputSpec> CGDelete::GetInputSpecInternal() 
 
 boost::shared_ptr<Fendle::CallSpec::OutputSpec> CGDelete::GetOutputSpecInternal() {
   return DeclareResult(Fendle::MetaObj::MetaBool::New());
+}
+
+void CGDelete::ExecuteInternal(const boost::shared_ptr<Fendle::CallSpec::Input>& input,
+                               const boost::shared_ptr<Fendle::CallSpec::Output>& output) {
+  // Read but not used yet: no library answers group requests.
+  input->GetString(kCgId);
+  input->GetString(kVpName);
+  EndWithTrue(output);
 }
 
 }  // namespace TarnNamespace

@@ -1,6 +1,7 @@
 #include "CGList.h"
 
 #include "CommandSpecs.h"
+#include "GroupListing.h"
 #include "SharedParameters.h"
 
 namespace HalvikCli {
@@ -37,6 +38,11 @@ boost::shared_ptr<Fendle::CallSpec::OutputSpec> CGList::GetOutputSpecInternal() 
 boost::shared_ptr<Fendle::MetaObj::MetaStruct> CGList::GetOutputStructure() {
   return NewTextStruct("CGList", {"CgId", "Name", "Description", "DestinationArrayId",
                                   "FailOverArrayId", "SourceArrayId", "State", "Warning", "Error"});
+}
+
+void CGList::ExecuteInternal(const boost::shared_ptr<Fendle::CallSpec::Input>& input,
+                             const boost::shared_ptr<Fendle::CallSpec::Output>& output) {
+  ExecuteGroupListing(*input, output, GetOutputStructure());
 }
 
 }  // namespace TarnNamespace

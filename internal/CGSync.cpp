@@ -1,6 +1,7 @@
 #include "CGSync.h"
 
 #include "CommandSpecs.h"
+#include "GroupListing.h"
 #include "SharedParameters.h"
 #include "TarnLib/TarnLib.h"
 #include "TarnLibBracket.h"
@@ -42,6 +43,11 @@ boost::shared_ptr<Fendle::CallSpec::OutputSpec> CGSync::GetOutputSpecInternal() 
 
 boost::shared_ptr<Fendle::MetaObj::MetaStruct> CGSync::GetOutputStructure() {
   return NewTextStruct("CGSync", {"CgId", "RpId", "TimeStamp", "Warning", "Error"});
+}
+
+void CGSync::ExecuteInternal(const boost::shared_ptr<Fendle::CallSpec::Input>& input,
+                             const boost::shared_ptr<Fendle::CallSpec::Output>& output) {
+  ExecuteGroupListing(*input, output, GetOutputStructure());
 }
 
 }  // namespace TarnNamespace

@@ -1,8 +1,17 @@
 #include "ConfigTarnAdd.h"
 
+#include <cstdint>
+#include <fstream>
+#include <string>
+
+#include "CommandEndings.h"
 #include "CommandSpecs.h"
+#include "ConfigTarnAction.h"
+#include "HostCtl/Lib.h"
+#include "OskCtl/Storage.h"
 #include "ParameterNames.h"
 #include "SharedParameters.h"
+#include "TarnFileSystemList.h"
 
 namespace HalvikCli {
 namespace TarnNamespace {
@@ -12,6 +21,18 @@ using Fendle::CallSpec::ParameterType;
 namespace {
 
 constexpr char kDescription[] = "ConfigTarnAdd a config Tarn in a given Tarn StorageContainer.";
+constexpr char kUnreadablePolicyFile[] = "Unable to read policy file ";
+constexpr char kCreateFailed[] = "Failed to create Config-Tarn. ";
+
+// Puts the first line of the file at path (without its line feed) into
+// policy; an empty file gives an empty policy. False when the file cannot be
+// opened or read.
+bool ReadPolicyLine(const std::string& path, std::string& policy) {
+  std::ifstream file(path);
+  if (!file.is_open()) return false;
+  std::getline(file, policy);
+  return !file.bad();
+}
 
 }  // namespace
 
@@ -38,6 +59,43 @@ boost::shared_ptr<Fendle::CallSpec::InputSpec> ConfigTarnAdd::GetInputSpecIntern
 
 boost::shared_ptr<Fendle::CallSpec::OutputSpec> ConfigTarnAdd::GetOutputSpecInternal() {
   return DeclareResult(Fendle::MetaObj::MetaBool::New());
+}
+
+void ConfigTarnAdd::ExecuteInternal(const boost::shared_ptr<Fendle::CallSpec::Input>& input,
+                                    const boost::shared_ptr<Fendle::CallSpec::Output>& output) {
+  OskCtl::Storage::StorageInfoImpl storageInfo;
+  const std::string name = input->GetString(kName);
+  const std::string containerId = input->GetString(kContainerId);
+  const bool priority = input->IsSet(kPriority);
+  const int64_t sizeMB = input->IsSet(kSize) ? input->GetInt(kSize) : 0;
+  const std::string vmUuid = input->IsSet(kVmUuid) ? input->GetString(kVmUuid) : std::string();
+
+  // A policy file wins over a policy given inline, which is then not read.
+  std::string policy;
+  if (input->IsSet(kPolicyFile)) {
+    const std::string path = input->GetString(kPolicyFile);
+    // Going on without the policy the user asked for would lose it silently.
+    if (!ReadPolicyLine(path, policy)) {
+      EndWithErrorAndFalse(output, kUnreadablePolicyFile + path);
+      return;
+    }
+  } else if (input->IsSet(kPolicy)) {
+    policy = input->GetString(kPolicy);
+  }
+
+  const TarnFileSystemList systems = TakeTarnFileSystems(storageInfo);
+  HostCtl::Storage::TarnFileSystem* container = FindByContainerId(systems, containerId);
+  if (container == nullptr) {
+    EndWithErrorAndFalse(output, kContainerNotFound + containerId);
+    return;
+  }
+  try {
+    std::string createdPath;  // the host tells where it created the object; not needed here
+    container->CreateConfigTarn(name, policy, sizeMB, vmUuid, createdPath, std::string(), priority);
+    EndWithTrue(output);
+  } catch (const HostCtl::Lib::HostCtlException& e) {
+    EndWithError(output, kCreateFailed + e.GetMessage(false));
+  }
 }
 
 }  // namespace TarnNamespace

@@ -1,6 +1,7 @@
 #include "ConfigTarnMountdir.h"
 
 #include "CommandSpecs.h"
+#include "ConfigTarnAction.h"
 #include "SharedParameters.h"
 
 namespace HalvikCli {
@@ -9,6 +10,7 @@ namespace TarnNamespace {
 namespace {
 
 constexpr char kDescription[] = "Mount a given config Tarn as directory in the Hyra file system";
+constexpr char kMissingName[] = "Either name or uuid is required";
 
 }  // namespace
 
@@ -27,6 +29,13 @@ boost::shared_ptr<Fendle::CallSpec::InputSpec> ConfigTarnMountdir::GetInputSpecI
 
 boost::shared_ptr<Fendle::CallSpec::OutputSpec> ConfigTarnMountdir::GetOutputSpecInternal() {
   return DeclareResult(Fendle::MetaObj::MetaBool::New());
+}
+
+void ConfigTarnMountdir::ExecuteInternal(
+    const boost::shared_ptr<Fendle::CallSpec::Input>& input,
+    const boost::shared_ptr<Fendle::CallSpec::Output>& output) {
+  ExecuteConfigTarnAction(*input, output, &HostCtl::Storage::TarnFileSystem::MountConfigTarn,
+                          kMissingName);
 }
 
 }  // namespace TarnNamespace

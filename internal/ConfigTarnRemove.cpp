@@ -1,6 +1,7 @@
 #include "ConfigTarnRemove.h"
 
 #include "CommandSpecs.h"
+#include "ConfigTarnAction.h"
 #include "SharedParameters.h"
 
 namespace HalvikCli {
@@ -9,6 +10,7 @@ namespace TarnNamespace {
 namespace {
 
 constexpr char kDescription[] = "Unmount and delete a given config Tarn.";
+constexpr char kMissingName[] = "Either name or uuid is required";
 
 }  // namespace
 
@@ -27,6 +29,12 @@ boost::shared_ptr<Fendle::CallSpec::InputSpec> ConfigTarnRemove::GetInputSpecInt
 
 boost::shared_ptr<Fendle::CallSpec::OutputSpec> ConfigTarnRemove::GetOutputSpecInternal() {
   return DeclareResult(Fendle::MetaObj::MetaBool::New());
+}
+
+void ConfigTarnRemove::ExecuteInternal(const boost::shared_ptr<Fendle::CallSpec::Input>& input,
+                                       const boost::shared_ptr<Fendle::CallSpec::Output>& output) {
+  ExecuteConfigTarnAction(*input, output, &HostCtl::Storage::TarnFileSystem::RemoveConfigTarn,
+                          kMissingName);
 }
 
 }  // namespace TarnNamespace

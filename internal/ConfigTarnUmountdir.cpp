@@ -1,6 +1,7 @@
 #include "ConfigTarnUmountdir.h"
 
 #include "CommandSpecs.h"
+#include "ConfigTarnAction.h"
 #include "SharedParameters.h"
 
 namespace HalvikCli {
@@ -9,6 +10,7 @@ namespace TarnNamespace {
 namespace {
 
 constexpr char kDescription[] = "Unmount a given Config Tarn from the Hyra file system";
+constexpr char kMissingName[] = "Either StorageContainer Name or UUID is required";
 
 }  // namespace
 
@@ -27,6 +29,13 @@ boost::shared_ptr<Fendle::CallSpec::InputSpec> ConfigTarnUmountdir::GetInputSpec
 
 boost::shared_ptr<Fendle::CallSpec::OutputSpec> ConfigTarnUmountdir::GetOutputSpecInternal() {
   return DeclareResult(Fendle::MetaObj::MetaBool::New());
+}
+
+void ConfigTarnUmountdir::ExecuteInternal(
+    const boost::shared_ptr<Fendle::CallSpec::Input>& input,
+    const boost::shared_ptr<Fendle::CallSpec::Output>& output) {
+  ExecuteConfigTarnAction(*input, output, &HostCtl::Storage::TarnFileSystem::UnmountConfigTarn,
+                          kMissingName);
 }
 
 }  // namespace TarnNamespace

@@ -23,5 +23,10 @@ boost::function<void()> InvocationBracket::Open(const char* source, int line) {
   return boost::function<void()>(boost::bind(&TarnLib_Exit));
 }
 
+TryInvocationBracket::TryInvocationBracket()
+    : open_(TarnLib_Init(0, 0)),
+      release_(open_ ? boost::function<void()>(boost::bind(&TarnLib_Exit))
+                     : boost::function<void()>()) {}
+
 }  // namespace TarnNamespace
 }  // namespace HalvikCli

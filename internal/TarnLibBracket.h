@@ -38,5 +38,21 @@ class InvocationBracket {
   Nestra::Finally release_;
 };
 
+// Tries to open the library for the enclosing scope without throwing. A
+// successful opening is released once when the scope is left, by any path.
+class TryInvocationBracket {
+ public:
+  TryInvocationBracket();
+  TryInvocationBracket(const TryInvocationBracket&) = delete;
+  TryInvocationBracket& operator=(const TryInvocationBracket&) = delete;
+
+  // Whether TarnLib_Init succeeded.
+  bool IsOpen() const { return open_; }
+
+ private:
+  bool open_;
+  Nestra::Finally release_;
+};
+
 }  // namespace TarnNamespace
 }  // namespace HalvikCli
