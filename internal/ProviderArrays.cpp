@@ -1,33 +1,14 @@
 #include "ProviderArrays.h"
 
 #include <cstdint>
-#include <limits>
-#include <sstream>
 
 #include "ParameterNames.h"
+#include "SharedParameters.h"
 
 namespace HalvikCli {
 namespace TarnNamespace {
 
 using HostCtl::Storage::RelatedStorageArrayInfo;
-
-namespace {
-
-// The host keeps a priority as a signed 32-bit integer; a wider value is
-// refused rather than cut, which would store a different priority.
-bool FitsPriority(int64_t value) {
-  return value >= std::numeric_limits<int32_t>::min() &&
-         value <= std::numeric_limits<int32_t>::max();
-}
-
-std::string PriorityOutOfRange(int64_t value) {
-  std::ostringstream text;
-  text << "Invalid value for parameter " << kPriority << ": " << value << " is outside the range "
-       << std::numeric_limits<int32_t>::min() << " to " << std::numeric_limits<int32_t>::max();
-  return text.str();
-}
-
-}  // namespace
 
 bool ReadProviderArrays(const Fendle::CallSpec::Input& input,
                         std::vector<RelatedStorageArrayInfo>& arrays, std::string& error) {
@@ -39,9 +20,10 @@ bool ReadProviderArrays(const Fendle::CallSpec::Input& input,
     error = kArrayListMismatch;
     return false;
   }
-  for (int64_t priority : priorities) {
-    if (!FitsPriority(priority)) {
-      error = PriorityOutOfRange(priority);
+  // The host keeps a priority in 32 bits.
+  std::vector<int32_t> narrowed(priorities.size());
+  for (std::size_t i = 0; i < priorities.size(); ++i) {
+    if (!NarrowToInt32(kPriority, priorities[i], narrowed[i], error)) {
       return false;
     }
   }
@@ -50,7 +32,7 @@ bool ReadProviderArrays(const Fendle::CallSpec::Input& input,
     RelatedStorageArrayInfo array;
     array.arrayId = ids[i];
     array.isActive = flags[i];
-    array.priority = static_cast<int32_t>(priorities[i]);
+    array.priority = narrowed[i];
     arrays.push_back(array);
   }
   return true;
