@@ -1,9 +1,16 @@
 #include "DaemonCommand.h"
 
 #include <boost/algorithm/string/predicate.hpp>
+#include <optional>
+#include <sstream>
+#include <vector>
 
+#include "CommandEndings.h"
 #include "CommandSpecs.h"
+#include "HostCtl/Storage.h"
+#include "OskCtl/Storage.h"
 #include "ParameterNames.h"
+#include "SharedParameters.h"
 #include "TarnLib/TarnLib.h"
 #include "TarnLibBracket.h"
 
@@ -28,6 +35,33 @@ constexpr LogLevelWord kLogLevels[] = {
 };
 // The level of a word that names none of the above.
 constexpr int32_t kDefaultLogLevel = 4;
+
+constexpr char kSpmFailedPrefix[] =
+    "TarnLib_SetSPMSpaceEfficiencyManipulationEnabled failed with error, ";
+constexpr char kDebugFailedPrefix[] = "TarnLib_DebugCommand  failed with error ";
+constexpr char kNeedOneParameter[] =
+    "At least one of the parameters --log-level, --dump-objects, --unbind-period, --unbind-now, "
+    "--start-pe-apd, --end-pe-apd, --disable-spm-space-efficiency-cmds is needed";
+constexpr char kNotifiedPrefix[] = "Notify PE APD command returned containers: ";
+constexpr char kNotifiedSeparator[] = ", ";
+constexpr int32_t kDumpObjectsValue = 1;
+constexpr int32_t kUnbindNowPeriod = 0;
+
+// The value for the daemon: a null pointer leaves its setting unchanged.
+const int32_t* SettingOf(const std::optional<int32_t>& value) { return value ? &*value : nullptr; }
+
+// The containers an APD notification affected, each followed by ", ".
+// Reported as the command's error: the notification sets no result.
+void EndWithNotifiedContainers(const OutputPtr& output,
+                               const std::vector<std::string>& containers) {
+  std::ostringstream text;
+  text << kNotifiedPrefix;
+  for (const std::string& container : containers) {
+    text << container << kNotifiedSeparator;
+  }
+  text << "." << std::endl;
+  EndWithError(output, text.str());
+}
 
 }  // namespace
 
@@ -78,6 +112,67 @@ boost::shared_ptr<Fendle::CallSpec::InputSpec> DaemonCommand::GetInputSpecIntern
 
 boost::shared_ptr<Fendle::CallSpec::OutputSpec> DaemonCommand::GetOutputSpecInternal() {
   return DeclareResult(Fendle::MetaObj::MetaBool::New());
+}
+
+void DaemonCommand::ExecuteInternal(const boost::shared_ptr<Fendle::CallSpec::Input>& input,
+                                    const boost::shared_ptr<Fendle::CallSpec::Output>& output) {
+  OskCtl::Storage::StorageInfoImpl storageInfo;
+  std::vector<std::string> containers;
+
+  // The debug settings are collected first, whichever action follows.
+  std::optional<int32_t> logLevel;
+  std::optional<int32_t> dumpObjects;
+  std::optional<int32_t> unbindPeriod;
+  if (input->IsSet(kLogLevel)) {
+    logLevel = GetLogLevelInt(input->GetString(kLogLevel));
+  }
+  if (input->GetFlag(kDumpObjects)) {
+    dumpObjects = kDumpObjectsValue;
+  }
+  if (input->GetFlag(kUnbindNow)) {
+    unbindPeriod = kUnbindNowPeriod;
+  } else if (input->IsSet(kUnbindPeriod)) {
+    int32_t period;
+    std::string error;
+    if (!ReadInt32(*input, kUnbindPeriod, period, error)) {
+      EndWithError(output, error);
+      return;
+    }
+    unbindPeriod = period;
+  }
+
+  if (input->IsSet(kStartPeApd)) {
+    storageInfo.NotifyTarnProtocolEndpointEvent(input->GetString(kStartPeApd),
+                                                HostCtl::Storage::PE_APD_START, containers);
+    EndWithNotifiedContainers(output, containers);
+    return;
+  }
+  if (input->IsSet(kEndPeApd)) {
+    storageInfo.NotifyTarnProtocolEndpointEvent(input->GetString(kEndPeApd),
+                                                HostCtl::Storage::PE_APD_END, containers);
+    EndWithNotifiedContainers(output, containers);
+    return;
+  }
+  if (input->IsSet(kDisableSpmSpaceEfficiencyCmds)) {
+    const TarnLib_Status status = TarnLib_SetSPMSpaceEfficiencyManipulationEnabled(
+        !input->GetBool(kDisableSpmSpaceEfficiencyCmds));
+    if (status == TARNLIB_OK) {
+      EndWithTrue(output);
+      return;
+    }
+    std::ostringstream text;
+    text << kSpmFailedPrefix << TarnLib_Err2String(status) << std::endl;
+    EndWithErrorAndFinish(output, text.str());
+    return;
+  }
+  if (logLevel || dumpObjects || unbindPeriod) {
+    EndWithDaemonStatus(
+        output,
+        TarnLib_DebugCommand(SettingOf(logLevel), SettingOf(dumpObjects), SettingOf(unbindPeriod)),
+        kDebugFailedPrefix);
+    return;
+  }
+  EndWithError(output, kNeedOneParameter);
 }
 
 }  // namespace TarnNamespace

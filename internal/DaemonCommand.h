@@ -27,6 +27,10 @@ class DaemonCommand : public virtual Fendle::AutoCli::Command {
 
   boost::shared_ptr<Fendle::CallSpec::InputSpec> GetInputSpecInternal() override;
   boost::shared_ptr<Fendle::CallSpec::OutputSpec> GetOutputSpecInternal() override;
+  // One of three actions, chosen by the parameters given: a protocol-endpoint
+  // APD notification, the space-efficiency switch, or the debug settings.
+  void ExecuteInternal(const boost::shared_ptr<Fendle::CallSpec::Input>& input,
+                       const boost::shared_ptr<Fendle::CallSpec::Output>& output) override;
 };
 
 }  // namespace TarnNamespace

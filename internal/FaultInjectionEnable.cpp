@@ -3,6 +3,7 @@
 #include "CommandEndings.h"
 #include "CommandSpecs.h"
 #include "ParameterNames.h"
+#include "TarnLib/TarnLib.h"
 #include "TarnLibBracket.h"
 
 namespace HalvikCli {
@@ -14,6 +15,7 @@ namespace {
 
 constexpr char kDescription[] = "Enable or disable Kiro Fault Injection.";
 constexpr char kSource[] = "internal/FaultInjectionEnable";
+constexpr char kChangeFailed[] = "Failed to change the fault injection status.";
 
 }  // namespace
 
@@ -38,10 +40,14 @@ boost::shared_ptr<Fendle::CallSpec::OutputSpec> FaultInjectionEnable::GetOutputS
 }
 
 void FaultInjectionEnable::ExecuteInternal(
-    const boost::shared_ptr<Fendle::CallSpec::Input>& /*input*/,
+    const boost::shared_ptr<Fendle::CallSpec::Input>& input,
     const boost::shared_ptr<Fendle::CallSpec::Output>& output) {
   InvocationBracket bracket(kSource, __LINE__);
-  EndWithError(output, kNotImplemented);
+  if (TarnLib_SetFaultInjectionEnabled(input->GetBool(kEnabled))) {
+    EndWithTrue(output);
+  } else {
+    EndWithError(output, kChangeFailed);
+  }
 }
 
 }  // namespace TarnNamespace

@@ -2,7 +2,9 @@
 
 #include "CommandEndings.h"
 #include "CommandSpecs.h"
+#include "FaultInjectionRule.h"
 #include "SharedParameters.h"
+#include "TarnLib/TarnLib.h"
 #include "TarnLibBracket.h"
 
 namespace HalvikCli {
@@ -12,6 +14,12 @@ namespace {
 
 constexpr char kDescription[] = "Add a fault injection rule.";
 constexpr char kSource[] = "internal/FaultInjectionRuleAdd";
+
+constexpr FaultRuleAction kAction = {
+    &TarnLib_AddFaultInjectionRule,
+    "The injection rule could not be added.",
+    "You must specify either a frequency or a maximum time to add a rule.",
+};
 
 }  // namespace
 
@@ -34,10 +42,10 @@ boost::shared_ptr<Fendle::CallSpec::OutputSpec> FaultInjectionRuleAdd::GetOutput
 }
 
 void FaultInjectionRuleAdd::ExecuteInternal(
-    const boost::shared_ptr<Fendle::CallSpec::Input>& /*input*/,
+    const boost::shared_ptr<Fendle::CallSpec::Input>& input,
     const boost::shared_ptr<Fendle::CallSpec::Output>& output) {
   InvocationBracket bracket(kSource, __LINE__);
-  EndWithError(output, kNotImplemented);
+  ExecuteFaultRule(*input, output, kAction);
 }
 
 }  // namespace TarnNamespace

@@ -1,9 +1,13 @@
 #include "FaultInjectionRuleRemove.h"
 
+#include <string>
+
 #include "CommandEndings.h"
 #include "CommandSpecs.h"
+#include "FaultInjectionRule.h"
 #include "ParameterNames.h"
 #include "SharedParameters.h"
+#include "TarnLib/TarnLib.h"
 #include "TarnLibBracket.h"
 
 namespace HalvikCli {
@@ -15,6 +19,7 @@ namespace {
 
 constexpr char kDescription[] = "Removes a fault injection rule.";
 constexpr char kSource[] = "internal/FaultInjectionRuleRemove";
+constexpr char kRemoveFailed[] = "The injection rule could not be removed.";
 
 }  // namespace
 
@@ -42,10 +47,18 @@ boost::shared_ptr<Fendle::CallSpec::OutputSpec> FaultInjectionRuleRemove::GetOut
 }
 
 void FaultInjectionRuleRemove::ExecuteInternal(
-    const boost::shared_ptr<Fendle::CallSpec::Input>& /*input*/,
+    const boost::shared_ptr<Fendle::CallSpec::Input>& input,
     const boost::shared_ptr<Fendle::CallSpec::Output>& output) {
   InvocationBracket bracket(kSource, __LINE__);
-  EndWithError(output, kNotImplemented);
+  const std::string fault = input->GetString(kFault);
+  const std::string operation = ReadRuleOperation(*input);
+  // A modify without frequency and time removes the rule.
+  if (TarnLib_ModifyFaultInjectionRule(operation.c_str(), fault.c_str(), kRuleLimitNotGiven,
+                                       kRuleLimitNotGiven)) {
+    EndWithTrue(output);
+  } else {
+    EndWithErrorFalseAndFinish(output, kRemoveFailed);
+  }
 }
 
 }  // namespace TarnNamespace

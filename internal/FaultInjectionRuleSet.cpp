@@ -2,7 +2,9 @@
 
 #include "CommandEndings.h"
 #include "CommandSpecs.h"
+#include "FaultInjectionRule.h"
 #include "SharedParameters.h"
+#include "TarnLib/TarnLib.h"
 #include "TarnLibBracket.h"
 
 namespace HalvikCli {
@@ -12,6 +14,12 @@ namespace {
 
 constexpr char kDescription[] = "Modify a fault injection rule.";
 constexpr char kSource[] = "internal/FaultInjectionRuleSet";
+
+constexpr FaultRuleAction kAction = {
+    &TarnLib_ModifyFaultInjectionRule,
+    "The injection rule could not be modified.  Verify that the rule exists.",
+    "You must specify either a frequency or a maximum time to modify a rule.",
+};
 
 }  // namespace
 
@@ -34,10 +42,10 @@ boost::shared_ptr<Fendle::CallSpec::OutputSpec> FaultInjectionRuleSet::GetOutput
 }
 
 void FaultInjectionRuleSet::ExecuteInternal(
-    const boost::shared_ptr<Fendle::CallSpec::Input>& /*input*/,
+    const boost::shared_ptr<Fendle::CallSpec::Input>& input,
     const boost::shared_ptr<Fendle::CallSpec::Output>& output) {
   InvocationBracket bracket(kSource, __LINE__);
-  EndWithError(output, kNotImplemented);
+  ExecuteFaultRule(*input, output, kAction);
 }
 
 }  // namespace TarnNamespace

@@ -3,12 +3,15 @@
 #include "CommandEndings.h"
 #include "CommandSpecs.h"
 #include "SharedParameters.h"
+#include "TarnLib/TarnLib.h"
 #include "TarnLibBracket.h"
+#include "VirtualVolumeQuery.h"
 
 namespace HalvikCli {
 namespace TarnNamespace {
 
 using Fendle::MetaObj::MetaList;
+using Fendle::MetaObj::MetaStruct;
 using Fendle::MetaObj::MetaType;
 
 namespace {
@@ -16,6 +19,18 @@ namespace {
 constexpr char kDescription[] = "List Virtual Volume MetaData.";
 constexpr char kSource[] = "internal/VirtualVolumeMetaDataList";
 constexpr int kInitLine = 88;
+
+constexpr char kKey[] = "key";
+constexpr char kValue[] = "value";
+// Also when the query succeeds without handing out a record.
+constexpr char kMetadataFailed[] = "Failed to get the metadata for Tarn.";
+
+// A text the entry lacks stays the row's empty text.
+void SetTextField(MetaStruct& row, const char* field, const char* text) {
+  if (text != nullptr) {
+    row.SetField(field, text);
+  }
+}
 
 }  // namespace
 
@@ -38,14 +53,37 @@ boost::shared_ptr<Fendle::CallSpec::OutputSpec> VirtualVolumeMetaDataList::GetOu
 }
 
 boost::shared_ptr<Fendle::MetaObj::MetaStruct> VirtualVolumeMetaDataList::GetOutputStructure() {
-  return NewTextStruct("TarnMetaData", {"key", "value"});
+  return NewTextStruct("TarnMetaData", {kKey, kValue});
 }
 
 void VirtualVolumeMetaDataList::ExecuteInternal(
-    const boost::shared_ptr<Fendle::CallSpec::Input>& /*input*/,
+    const boost::shared_ptr<Fendle::CallSpec::Input>& input,
     const boost::shared_ptr<Fendle::CallSpec::Output>& output) {
   InvocationBracket bracket(kSource, kInitLine);
-  EndWithError(output, kNotImplemented);
+  VirtualVolumeAddress volume;
+  if (!ReadVirtualVolumeAddress(*input, output, volume)) {
+    return;
+  }
+
+  TarnMetadata* record = nullptr;
+  const TarnLib_Status status =
+      TarnLib_GetTarnMetadata(volume.containerId, volume.uuid.c_str(), &record);
+  const TarnMetadataOwner metadata(record);
+  if (status != TARNLIB_OK || !metadata) {
+    EndWithError(output, kMetadataFailed);
+    return;
+  }
+
+  // One row per entry, in the daemon's order.
+  boost::shared_ptr<MetaList> rows = MetaList::New(MetaType::Struct, GetOutputStructure());
+  for (const TarnMetadataEntry* entry = metadata->first; entry != nullptr; entry = entry->next) {
+    boost::shared_ptr<MetaStruct> row = GetOutputStructure();
+    SetTextField(*row, kKey, entry->key);
+    SetTextField(*row, kValue, entry->value);
+    rows->Append(row);
+  }
+  // The record is released by its owner after Finish.
+  EndWithResult(output, rows);
 }
 
 }  // namespace TarnNamespace

@@ -90,17 +90,25 @@ TEST_F(BracketTest, ConstructorBracketHoldsTheLibraryForTheObjectsLife) {
 }
 
 TEST_F(BracketTest, InvocationBracketReleasesOnceOnEveryWayOut) {
-  const Bracketed cases[] = {
-      {"internal/FaultInjectionEnable", 0, Maker<FaultInjectionEnable>()},
-      {"internal/FaultInjectionRuleAdd", 0, Maker<FaultInjectionRuleAdd>()},
-      {"internal/FaultInjectionRuleSet", 0, Maker<FaultInjectionRuleSet>()},
-      {"internal/FaultInjectionRuleRemove", 0, Maker<FaultInjectionRuleRemove>()},
-      {"internal/VirtualVolumeGet", 102, Maker<VirtualVolumeGet>()},
-      {"internal/VirtualVolumeMetaDataList", 88, Maker<VirtualVolumeMetaDataList>()},
+  struct Case {
+    Bracketed command;
+    // The sink call that an invocation without parameters reaches; the sink
+    // throws from it to leave the invocation by an exception.
+    RecordingOutput::ThrowOn reached;
   };
-  for (const Bracketed& c : cases) {
-    SCOPED_TRACE(c.source);
-    boost::shared_ptr<Command> command = c.make();
+  const RecordingOutput::ThrowOn kError = RecordingOutput::ThrowOn::kError;
+  const Case cases[] = {
+      {{"internal/FaultInjectionEnable", 0, Maker<FaultInjectionEnable>()},
+       RecordingOutput::ThrowOn::kResult},
+      {{"internal/FaultInjectionRuleAdd", 0, Maker<FaultInjectionRuleAdd>()}, kError},
+      {{"internal/FaultInjectionRuleSet", 0, Maker<FaultInjectionRuleSet>()}, kError},
+      {{"internal/FaultInjectionRuleRemove", 0, Maker<FaultInjectionRuleRemove>()}, kError},
+      {{"internal/VirtualVolumeGet", 102, Maker<VirtualVolumeGet>()}, kError},
+      {{"internal/VirtualVolumeMetaDataList", 88, Maker<VirtualVolumeMetaDataList>()}, kError},
+  };
+  for (const Case& c : cases) {
+    SCOPED_TRACE(c.command.source);
+    boost::shared_ptr<Command> command = c.command.make();
 
     TarnLibSim_ResetCounters();
     command->Execute(MakeInput(nullptr), RecordingOutput::New());
@@ -109,8 +117,7 @@ TEST_F(BracketTest, InvocationBracketReleasesOnceOnEveryWayOut) {
 
     // An exception from inside the invocation still releases the library.
     TarnLibSim_ResetCounters();
-    EXPECT_THROW(command->Execute(MakeInput(nullptr),
-                                  RecordingOutput::New(RecordingOutput::ThrowOn::kError)),
+    EXPECT_THROW(command->Execute(MakeInput(nullptr), RecordingOutput::New(c.reached)),
                  HostCtl::Lib::HostCtlException);
     EXPECT_EQ(TarnLibSim_InitCalls(), 1);
     EXPECT_EQ(TarnLibSim_ExitCalls(), 1);
@@ -118,7 +125,7 @@ TEST_F(BracketTest, InvocationBracketReleasesOnceOnEveryWayOut) {
     TarnLibSim_ResetCounters();
     Arm("TarnLib_Init");
     boost::shared_ptr<RecordingOutput> output = RecordingOutput::New();
-    ExpectInitFailure([&] { command->Execute(MakeInput(nullptr), output); }, c);
+    ExpectInitFailure([&] { command->Execute(MakeInput(nullptr), output); }, c.command);
     EXPECT_TRUE(output->Calls().empty());
     EXPECT_EQ(TarnLibSim_ExitCalls(), 0);
     EXPECT_EQ(TarnLibSim_Openings(), 0);
