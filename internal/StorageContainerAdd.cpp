@@ -1,6 +1,14 @@
 #include "StorageContainerAdd.h"
 
+#include <memory>
+#include <string>
+#include <vector>
+
+#include "CommandEndings.h"
 #include "CommandSpecs.h"
+#include "HostCtl/Lib.h"
+#include "HostCtl/Storage.h"
+#include "OskCtl/Storage.h"
 #include "ParameterNames.h"
 
 namespace HalvikCli {
@@ -34,6 +42,25 @@ boost::shared_ptr<Fendle::CallSpec::InputSpec> StorageContainerAdd::GetInputSpec
 
 boost::shared_ptr<Fendle::CallSpec::OutputSpec> StorageContainerAdd::GetOutputSpecInternal() {
   return DeclareResult(Fendle::MetaObj::MetaBool::New());
+}
+
+void StorageContainerAdd::ExecuteInternal(
+    const boost::shared_ptr<Fendle::CallSpec::Input>& input,
+    const boost::shared_ptr<Fendle::CallSpec::Output>& output) {
+  OskCtl::Storage::StorageInfoImpl storageInfo;
+  const std::string name = input->GetString(kContainerName);
+  std::string id = input->GetString(kContainerId);
+  const std::vector<std::string> arrayIds = input->GetStringList(kArray);
+  try {
+    std::unique_ptr<HostCtl::Storage::TarnFileSystem> system(
+        storageInfo.AddTarnFileSystem(name, id, arrayIds, true));
+    // A host that mounted nothing answers false, without an error of its own.
+    output->SetResult(Fendle::MetaObj::MetaBool::New(system != nullptr));
+    system.reset();
+    output->Finish();
+  } catch (const HostCtl::Lib::HostCtlException& e) {
+    EndWithError(output, e.GetMessage(false));
+  }
 }
 
 }  // namespace TarnNamespace

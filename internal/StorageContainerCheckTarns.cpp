@@ -1,6 +1,14 @@
 #include "StorageContainerCheckTarns.h"
 
+#include <algorithm>
+#include <cstdint>
+#include <memory>
+
+#include "CommandEndings.h"
 #include "CommandSpecs.h"
+#include "DaemonTexts.h"
+#include "HostCtl/Lib.h"
+#include "OskCtl/Storage.h"
 #include "ParameterNames.h"
 #include "TarnLib/TarnLib.h"
 #include "TarnLibBracket.h"
@@ -10,13 +18,58 @@ namespace TarnNamespace {
 
 using Fendle::CallSpec::ParameterType;
 using Fendle::MetaObj::MetaList;
+using Fendle::MetaObj::MetaStruct;
 using Fendle::MetaObj::MetaType;
+using HostCtl::Storage::TarnAccessibilityType;
 
 namespace {
 
 constexpr char kDescription[] = "Check availability of given Tarns in a StorageContainer";
 constexpr char kSource[] = "internal/StorageContainerCheckTarns";
 constexpr int kInitLine = 40;
+
+constexpr char kRowStructure[] = "TarnsAreAccessible";
+constexpr char kTarnIdField[] = "TarnId";
+constexpr char kStatusField[] = "Status";
+constexpr char kBadPath[] = "Bad datastore path";
+// Asks the daemon for every config-tarn at once.
+constexpr int32_t kAllEntries = 2147483647;
+
+struct FreeQueryResult {
+  void operator()(QueryResult* result) const { TarnLib_FreeQueryResult(result); }
+};
+typedef std::unique_ptr<QueryResult, FreeQueryResult> QueryResultOwner;
+
+// The ids of the container's config-tarns in the daemon's order; none when
+// the query fails, which is not reported.
+std::vector<std::string> QueryConfigTarnIds(const std::string& containerId) {
+  QueryResult* handedOut = nullptr;
+  const TarnLib_Status status =
+      TarnLib_QueryAllConfigTarns(containerId.c_str(), kAllEntries, 0, &handedOut, 0);
+  // Given back whether the query succeeded or not.
+  const QueryResultOwner result(handedOut);
+  std::vector<std::string> ids;
+  if (status != TARNLIB_OK || result == nullptr || result->entries == nullptr) return ids;
+  for (int32_t i = 0; i < result->entryCount; ++i) {
+    if (const ConfigTarnEntry* entry = result->entries[i]) ids.push_back(TextOf(entry->tarnId));
+  }
+  return ids;
+}
+
+// The status word of a state, or null for a state without one.
+const char* StatusWord(TarnAccessibilityType state) {
+  switch (state) {
+    case HostCtl::Storage::TARN_NON_EXISTENT:
+      return "non-existent";
+    case HostCtl::Storage::TARN_UNCONFIRMED:
+      return "unconfirmed";
+    case HostCtl::Storage::TARN_INACCESSIBLE:
+      return "inaccessible";
+    case HostCtl::Storage::TARN_ACCESSIBLE:
+      return "accessible";
+  }
+  return nullptr;
+}
 
 }  // namespace
 
@@ -47,7 +100,42 @@ StorageContainerCheckTarns::GetOutputSpecInternal() {
 }
 
 boost::shared_ptr<Fendle::MetaObj::MetaStruct> StorageContainerCheckTarns::GetOutputStructure() {
-  return NewTextStruct("TarnsAreAccessible", {"TarnId", "Status"});
+  return NewTextStruct(kRowStructure, {kTarnIdField, kStatusField});
+}
+
+boost::shared_ptr<MetaList> StorageContainerCheckTarns::GetAccessibilityList(
+    const std::vector<std::string>& tarnIds, const std::vector<TarnAccessibilityType>& states) {
+  const boost::shared_ptr<MetaList> rows = MetaList::New(MetaType::Struct, GetOutputStructure());
+  const size_t count = std::min(tarnIds.size(), states.size());
+  for (size_t i = 0; i < count; ++i) {
+    const boost::shared_ptr<MetaStruct> row = GetOutputStructure();
+    row->SetField(kTarnIdField, tarnIds[i]);
+    // A state without a word leaves the status empty.
+    if (const char* word = StatusWord(states[i])) row->SetField(kStatusField, word);
+    rows->Append(row);
+  }
+  return rows;
+}
+
+void StorageContainerCheckTarns::ExecuteInternal(
+    const boost::shared_ptr<Fendle::CallSpec::Input>& input,
+    const boost::shared_ptr<Fendle::CallSpec::Output>& output) {
+  OskCtl::Storage::StorageInfoImpl storageInfo;
+  const std::string path = input->GetString(kPath);
+  std::vector<std::string> tarnIds = input->GetStringList(kTarn);
+  try {
+    // Belongs to storageInfo, which outlives every use of it here.
+    HostCtl::Storage::TarnFileSystem* container = storageInfo.GetTarnFileSystemByPath(path);
+    if (container == nullptr) {
+      EndWithError(output, kBadPath);
+      return;
+    }
+    if (tarnIds.empty()) tarnIds = QueryConfigTarnIds(container->GetContainerIdText());
+    const std::vector<TarnAccessibilityType> states = container->CheckTarnAccessibility(tarnIds);
+    EndWithResult(output, GetAccessibilityList(tarnIds, states));
+  } catch (const HostCtl::Lib::HostCtlException& e) {
+    EndWithError(output, e.GetMessage(false));
+  }
 }
 
 }  // namespace TarnNamespace

@@ -3,8 +3,11 @@
 #pragma once
 
 #include <boost/shared_ptr.hpp>
+#include <string>
+#include <vector>
 
 #include "Fendle/AutoCli.h"
+#include "HostCtl/Storage.h"
 
 namespace HalvikCli {
 namespace TarnNamespace {
@@ -18,6 +21,12 @@ class StorageContainerCheckTarns : public virtual Fendle::AutoCli::Command {
   // The prototype of one result row.
   virtual boost::shared_ptr<Fendle::MetaObj::MetaStruct> GetOutputStructure();
 
+  // One row per state answered, with the id at the same position; never
+  // reads past the end of either list.
+  boost::shared_ptr<Fendle::MetaObj::MetaList> GetAccessibilityList(
+      const std::vector<std::string>& tarnIds,
+      const std::vector<HostCtl::Storage::TarnAccessibilityType>& states);
+
  protected:
   // Opens the daemon client library as its last step; throws
   // OskCtl::Lib::OskCtlException when it cannot.
@@ -25,6 +34,8 @@ class StorageContainerCheckTarns : public virtual Fendle::AutoCli::Command {
 
   boost::shared_ptr<Fendle::CallSpec::InputSpec> GetInputSpecInternal() override;
   boost::shared_ptr<Fendle::CallSpec::OutputSpec> GetOutputSpecInternal() override;
+  void ExecuteInternal(const boost::shared_ptr<Fendle::CallSpec::Input>& input,
+                       const boost::shared_ptr<Fendle::CallSpec::Output>& output) override;
 };
 
 }  // namespace TarnNamespace

@@ -1,6 +1,16 @@
 #include "StorageContainerLoad.h"
 
+#include <algorithm>
+#include <memory>
+#include <sstream>
+
+#include "CommandEndings.h"
 #include "CommandSpecs.h"
+#include "DaemonTexts.h"
+#include "HostCtl/Lib.h"
+#include "HostCtl/Storage.h"
+#include "OskCtl/Storage.h"
+#include "TarnFileSystemList.h"
 #include "TarnLib/TarnLib.h"
 #include "TarnLibBracket.h"
 
@@ -33,7 +43,88 @@ constexpr char kVendorIdField[] = "VendorId";
 constexpr char kModelIdField[] = "ModelId";
 constexpr char kPeInfoField[] = "PEInfo";
 
+constexpr char kLoadFailedPrefix[] = "Unable to load Tarn datastores: ";
+constexpr char kMountFailedPrefix[] = "Error getting/adding tarn file system '";
+constexpr char kMountFailedSuffix[] = ", skipping";
+constexpr char kNothingMountedPrefix[] = "Unable to mount ";
+
+struct FreeStorageContainerResult {
+  void operator()(StorageContainerResult* result) const {
+    TarnLib_FreeStorageContainerResult(result);
+  }
+};
+typedef std::unique_ptr<StorageContainerResult, FreeStorageContainerResult> ContainerResultOwner;
+
+// The NFS4x addresses of an endpoint joined by commas.
+std::string JoinAddresses(const ProtocolEndpointRecord& endpoint) {
+  std::string joined;
+  for (int32_t i = 0; endpoint.nfs4xAddresses != nullptr && i < endpoint.nfs4xAddressCount; ++i) {
+    if (i > 0) joined += ',';
+    joined += TextOf(endpoint.nfs4xAddresses[i]);
+  }
+  return joined;
+}
+
+SAInfo ReadStorageArray(const StorageArrayRecord& array) {
+  SAInfo info;
+  info.arrayId = TextOf(array.arrayId);
+  info.arrayName = TextOf(array.arrayName);
+  info.vendorId = TextOf(array.vendorId);
+  info.modelId = TextOf(array.modelId);
+  for (int32_t j = 0; array.protocolEndpoints != nullptr && j < array.peCount; ++j) {
+    if (const ProtocolEndpointRecord* endpoint = array.protocolEndpoints[j]) {
+      info.peInfo.push_back(DescribeProtocolEndpoint(j, *endpoint));
+    }
+  }
+  return info;
+}
+
 }  // namespace
+
+std::vector<std::string> ReadArrayIds(const StorageContainerRecord& container) {
+  std::vector<std::string> ids;
+  for (int32_t i = 0; container.arrays != nullptr && i < container.arrayCount; ++i) {
+    if (const StorageArrayRecord* array = container.arrays[i])
+      ids.push_back(TextOf(array->arrayId));
+  }
+  return ids;
+}
+
+std::vector<SAInfo> ReadStorageArrays(const StorageContainerRecord& container) {
+  std::vector<SAInfo> arrays;
+  for (int32_t i = 0; container.arrays != nullptr && i < container.arrayCount; ++i) {
+    if (const StorageArrayRecord* array = container.arrays[i]) {
+      arrays.push_back(ReadStorageArray(*array));
+    }
+  }
+  return arrays;
+}
+
+std::string DescribeProtocolEndpoint(int32_t index, const ProtocolEndpointRecord& endpoint) {
+  std::ostringstream line;
+  line << "PE #" << index << " (localUID: " << TextOf(endpoint.localUID)
+       << ", isAccessible: " << (endpoint.isAccessible != 0 ? 1 : 0)
+       << ", isConfigured: " << (endpoint.isConfigured != 0 ? 1 : 0);
+  // An endpoint without an address is described like one of an unknown type.
+  if (endpoint.address == nullptr) return line.str();
+  const ProtocolEndpointAddress& address = *endpoint.address;
+  switch (address.type) {
+    case PROTOCOL_ENDPOINT_SCSI:
+      line << ", type: SCSI, lunID: " << TextOf(address.firstText) << ")";
+      break;
+    case PROTOCOL_ENDPOINT_NFS:
+      line << ", type: NFS, ipAddress: " << TextOf(address.firstText)
+           << ", serverMount: " << TextOf(address.secondText) << ")";
+      break;
+    case PROTOCOL_ENDPOINT_NFS4X:
+      line << ", type: NFS4x, ipAddress(es): " << JoinAddresses(endpoint)
+           << ", serverMount: " << TextOf(address.firstText) << ")";
+      break;
+    default:
+      break;
+  }
+  return line.str();
+}
 
 boost::shared_ptr<StorageContainerLoad> StorageContainerLoad::New() {
   return boost::shared_ptr<StorageContainerLoad>(new StorageContainerLoad());
@@ -94,6 +185,59 @@ boost::shared_ptr<MetaList> StorageContainerLoad::GetStorageArrayList(
     list->Append(array);
   }
   return list;
+}
+
+void StorageContainerLoad::ExecuteInternal(
+    const boost::shared_ptr<Fendle::CallSpec::Input>& /*input*/,
+    const boost::shared_ptr<Fendle::CallSpec::Output>& output) {
+  OskCtl::Storage::StorageInfoImpl storageInfo;
+  StorageContainerResult* handedOut = nullptr;
+  const TarnLib_ErrorEx error = TarnLib_GetStorageContainer(1, nullptr, &handedOut);
+  const ContainerResultOwner result(handedOut);
+  if (!TarnLib_ErrorExIsSuccess(&error)) {
+    EndWithError(output, kLoadFailedPrefix + TextOf(TarnLib_ErrorExStr(&error)));
+    return;
+  }
+
+  try {
+    // Taken once: a container mounted below is not looked up again.
+    const TarnFileSystemList mounted = TakeTarnFileSystems(storageInfo);
+    std::vector<std::string> mountedNames;
+    for (const auto& system : mounted) mountedNames.push_back(system->GetContainerName());
+
+    const boost::shared_ptr<MetaList> rows = MetaList::New(MetaType::Struct, GetOutputStructure());
+    // A success without a result exports nothing.
+    const uint32_t count =
+        result != nullptr && result->containers != nullptr ? result->containerCount : 0;
+    for (uint32_t i = 0; i < count; ++i) {
+      const StorageContainerRecord* container = result->containers[i];
+      if (container == nullptr) continue;
+      const std::string name = TextOf(container->containerName);
+      std::string id = TextOf(container->containerId);
+      const std::vector<std::string> arrayIds = ReadArrayIds(*container);
+      if (std::find(mountedNames.begin(), mountedNames.end(), name) != mountedNames.end()) {
+        continue;
+      }
+
+      const std::unique_ptr<HostCtl::Storage::TarnFileSystem> system(
+          storageInfo.AddTarnFileSystem(name, id, arrayIds, true));
+      // A mount that yields nothing ends the load as a refused mount does.
+      if (system == nullptr) {
+        throw HostCtl::Lib::HostCtlException(kNothingMountedPrefix + name,
+                                             HostCtl::Lib::KelmMessage());
+      }
+      const boost::shared_ptr<MetaStruct> row = GetOutputStructure();
+      row->SetField(kContainerNameField, system->GetContainerName());
+      row->SetField(kContainerIdField, system->GetContainerId());
+      row->SetField(kMaxTarnSizeField, container->maxTarnSizeMB);
+      row->SetField(kVpUrlField, TextOf(container->vpUrl));
+      row->SetField(kArraysField, GetStorageArrayList(ReadStorageArrays(*container)));
+      rows->Append(row);
+    }
+    EndWithResult(output, rows);
+  } catch (const HostCtl::Lib::HostCtlException& e) {
+    EndWithError(output, kMountFailedPrefix + e.GetMessage(false) + kMountFailedSuffix);
+  }
 }
 
 }  // namespace TarnNamespace

@@ -4,10 +4,12 @@
 #pragma once
 
 #include <boost/shared_ptr.hpp>
+#include <cstdint>
 #include <string>
 #include <vector>
 
 #include "Fendle/AutoCli.h"
+#include "TarnLib/TarnLib.h"
 
 namespace HalvikCli {
 namespace TarnNamespace {
@@ -20,6 +22,16 @@ struct SAInfo {
   std::string modelId;
   std::vector<std::string> peInfo;  // one description line per protocol endpoint
 };
+
+// The ids of a container's arrays, in the daemon's order.
+std::vector<std::string> ReadArrayIds(const StorageContainerRecord& container);
+
+// A container's arrays, each with the description line of every protocol
+// endpoint, in the daemon's order.
+std::vector<SAInfo> ReadStorageArrays(const StorageContainerRecord& container);
+
+// The description line of the protocol endpoint at index within its array.
+std::string DescribeProtocolEndpoint(int32_t index, const ProtocolEndpointRecord& endpoint);
 
 class StorageContainerLoad : public virtual Fendle::AutoCli::Command {
  public:
@@ -43,6 +55,8 @@ class StorageContainerLoad : public virtual Fendle::AutoCli::Command {
 
   boost::shared_ptr<Fendle::CallSpec::InputSpec> GetInputSpecInternal() override;
   boost::shared_ptr<Fendle::CallSpec::OutputSpec> GetOutputSpecInternal() override;
+  void ExecuteInternal(const boost::shared_ptr<Fendle::CallSpec::Input>& input,
+                       const boost::shared_ptr<Fendle::CallSpec::Output>& output) override;
 };
 
 }  // namespace TarnNamespace

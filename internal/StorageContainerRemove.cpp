@@ -1,6 +1,12 @@
 #include "StorageContainerRemove.h"
 
+#include <cstring>
+#include <string>
+
+#include "CommandEndings.h"
 #include "CommandSpecs.h"
+#include "HostCtl/Lib.h"
+#include "OskCtl/Storage.h"
 #include "ParameterNames.h"
 #include "TarnLib/TarnLib.h"
 #include "TarnLibBracket.h"
@@ -15,6 +21,7 @@ namespace {
 constexpr char kDescription[] = "Remove given Tarn StorageContainer from Hyra host";
 constexpr char kSource[] = "internal/StorageContainerRemove";
 constexpr int kInitLine = 31;
+constexpr char kBadIdPrefix[] = "Bad CID : ";
 
 }  // namespace
 
@@ -38,6 +45,26 @@ boost::shared_ptr<Fendle::CallSpec::InputSpec> StorageContainerRemove::GetInputS
 
 boost::shared_ptr<Fendle::CallSpec::OutputSpec> StorageContainerRemove::GetOutputSpecInternal() {
   return DeclareResult(Fendle::MetaObj::MetaBool::New());
+}
+
+void StorageContainerRemove::ExecuteInternal(
+    const boost::shared_ptr<Fendle::CallSpec::Input>& input,
+    const boost::shared_ptr<Fendle::CallSpec::Output>& output) {
+  OskCtl::Storage::StorageInfoImpl storageInfo;
+  const std::string id = input->GetString(kContainerId);
+  char normalized[TARNLIB_CONTAINER_ID_TEXT_SIZE] = {};
+  if (!TarnLib_NormalizeContainerIdString(id.c_str(), normalized)) {
+    EndWithError(output, kBadIdPrefix + id);
+    return;
+  }
+  try {
+    // Never read past the buffer, even were its terminator missing.
+    storageInfo.RemoveTarnFileSystem(
+        std::string(normalized, strnlen(normalized, sizeof normalized)));
+    EndWithTrue(output);
+  } catch (const HostCtl::Lib::HostCtlException& e) {
+    EndWithError(output, e.GetMessage(false));
+  }
 }
 
 }  // namespace TarnNamespace

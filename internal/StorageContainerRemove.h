@@ -22,6 +22,8 @@ class StorageContainerRemove : public virtual Fendle::AutoCli::Command {
 
   boost::shared_ptr<Fendle::CallSpec::InputSpec> GetInputSpecInternal() override;
   boost::shared_ptr<Fendle::CallSpec::OutputSpec> GetOutputSpecInternal() override;
+  void ExecuteInternal(const boost::shared_ptr<Fendle::CallSpec::Input>& input,
+                       const boost::shared_ptr<Fendle::CallSpec::Output>& output) override;
 };
 
 }  // namespace TarnNamespace
