@@ -1,6 +1,5 @@
 #include <gtest/gtest.h>
 
-#include <nlohmann/json.hpp>
 #include <sstream>
 
 #include "fendle/Formatter.h"
@@ -132,18 +131,14 @@ TEST(JsonFormatterTest, StructsFollowTheDisplayOrderAndTextsStayExact) {
             "[\n  {\n    \"StorageContainer Name\": \"ds1\",\n    \"Max Tarn Size (MB)\": 1,\n"
             "    \"Arrays\": []\n  }\n]\n");
   EXPECT_EQ(Render("json", MetaBool::New(true)), "true\n");
-  EXPECT_EQ(Render("json", MetaString::New("a\n")), "\"a\\n\"\n");
   EXPECT_EQ(Render("json", MetaInt::New(INT64_MIN)), "-9223372036854775808\n");
-
   // Bytes that are not UTF-8 become U+FFFD, in keys and values alike.
   auto odd = MetaStruct::New("R");
   odd->SetField("Na\xFFme", "ab\xFF\xFE\n");
   odd->SetField("Ok", "\xC3\xA4");
-  std::string out = Render("json", odd);
-  ASSERT_EQ(out.back(), '\n');
-  nlohmann::json parsed = nlohmann::json::parse(out);
-  EXPECT_EQ(parsed["Na\xEF\xBF\xBDme"], "ab\xEF\xBF\xBD\xEF\xBF\xBD\n");
-  EXPECT_EQ(parsed["Ok"], "\xC3\xA4");
+  EXPECT_EQ(
+      Render("json", odd),
+      "{\n  \"Na\xEF\xBF\xBDme\": \"ab\xEF\xBF\xBD\xEF\xBF\xBD\\n\",\n  \"Ok\": \"\xC3\xA4\"\n}\n");
 }
 
 }  // namespace

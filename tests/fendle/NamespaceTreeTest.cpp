@@ -78,15 +78,8 @@ TEST(NamespaceTreeTest, RefusedRegistrationChangesNothing) {
   EXPECT_EQ(t.loose->GetName(), "loose");
 }
 
-TEST(CommandTest, DefaultsAndHints) {
-  Tree t;
-  auto command = boost::dynamic_pointer_cast<TestCommand>(t.run);
-  auto output = Fendle::CallSpec::Output::New();
-  command->Execute(nullptr, output);
-  EXPECT_EQ(output->GetErrors(), Words{"The command 'storage taken run' is not implemented."});
-  EXPECT_FALSE(output->IsFinished() || output->GetResult());
-  EXPECT_FALSE(command->GetOutputSpec()->GetResultType());
-
+TEST(CommandTest, SettingAHintAgainReplacesItInPlace) {
+  auto command = TestCommand::New();
   command->SetDefaultOutputParameter("header:A", "%X%");
   command->SetDefaultOutputParameter("fields:A", "X,Y");
   command->SetDefaultOutputParameter("header:A", "%Y%");

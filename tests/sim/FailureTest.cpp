@@ -1,6 +1,5 @@
 // Armed failures: counts shared between processes, injected texts, and the
 // "nothing" answers of --null.
-#include <memory>
 #include <string>
 
 #include "HostCtl/Lib.h"
@@ -13,19 +12,8 @@ namespace {
 using HostCtl::Lib::HostCtlException;
 using HostCtl::Storage::TarnFileSystem;
 using OskCtl::Storage::StorageInfoImpl;
-using SimTest::FreshWorld;
 using SimTest::Opened;
-
-using Failures = FreshWorld;
-
-HyraSim::FailureSpec Spec(const std::string& message, int64_t after, int64_t times, bool null) {
-  HyraSim::FailureSpec spec;
-  spec.message = message;
-  spec.after = after;
-  spec.times = times;
-  spec.null = null;
-  return spec;
-}
+using Failures = SimTest::FreshWorld;
 
 TEST_F(Failures, AfterAndTimesCountAcrossProcesses) {
   ASSERT_EQ(Hyrasim("fail TarnVpExists --after 1 --times 2 --message 'host is busy'").status, 0);
@@ -34,10 +22,9 @@ TEST_F(Failures, AfterAndTimesCountAcrossProcesses) {
   EXPECT_TRUE(HyraSim::ArmedFailures().empty()) << "a spent arming is gone";
 }
 
-TEST_F(Failures, ArmingAgainReplacesAndClearDisarmsEverything) {
-  HyraSim::ArmFailure("TarnVpExists", Spec("first", 5, 5, false));
-  HyraSim::ArmFailure("TarnVpExists", Spec("second", 0, 1, false));
-  HyraSim::ArmFailure("GetTarnFileSystems", Spec("x", 0, 1, false));
+TEST_F(Failures, ArmingAgainReplacesFailedCallsHaveNoEffectAndClearDisarms) {
+  HyraSim::ArmFailure("TarnVpExists", {"first", 5, 5, false});
+  HyraSim::ArmFailure("TarnVpExists", {"second"});
   StorageInfoImpl host;
   try {
     host.TarnVpExists("vp1");
@@ -45,6 +32,19 @@ TEST_F(Failures, ArmingAgainReplacesAndClearDisarmsEverything) {
   } catch (const HostCtlException& e) {
     EXPECT_EQ(e.GetMessage(false), "second");
   }
+  HyraSim::ArmFailure("AddTarnFileSystem", {"mount refused"});
+  std::string id = SimTest::kSilverId;
+  EXPECT_THROW(host.AddTarnFileSystem("silver", id, {}, true), HostCtlException);
+  HyraSim::ArmFailure("CreateConfigTarn", {"create refused"});
+  TarnFileSystem* gold = host.GetTarnFileSystemByPath("/hyra/volumes/gold");
+  std::string path;
+  EXPECT_THROW(gold->CreateConfigTarn("new", "", 1, "", path, "", false), HostCtlException);
+  const auto world = World();
+  EXPECT_EQ(world["host"]["mounted"].size(), 1u);
+  EXPECT_EQ(world["containers"][0]["tarns"].size(), 2u);
+
+  HyraSim::ArmFailure("TarnVpExists", {"again"});
+  HyraSim::ArmFailure("GetTarnFileSystems", {"x"});
   HyraSim::ClearFailures();
   EXPECT_TRUE(host.TarnVpExists("vp1"));
   const auto systems = host.GetTarnFileSystems();
@@ -52,29 +52,29 @@ TEST_F(Failures, ArmingAgainReplacesAndClearDisarmsEverything) {
   for (TarnFileSystem* fs : systems) delete fs;
 }
 
-TEST_F(Failures, ArmingRefusesUnknownNamesAndBadCounts) {
-  const std::string refused[] = {
-      "fail NoSuchOperation",
-      "fail TarnLib_Exit",
-      "fail TarnLib_FreeTarnInfo",
-      "fail TarnVpExists --times 0",
-      "fail TarnVpExists --after -1",
-      "fail TarnVpExists --after",
-      "fail TarnVpExists --times 2x",
-      "fail TarnVpExists --loud",
-      "fail",
-  };
-  for (const std::string& arguments : refused) {
+TEST_F(Failures, HyrasimRefusalsSayWhyAndChangeNothing) {
+  // clang-format off
+  const char* refused[] = {
+      "bogus", "init", "init --scenario", "show --yaml", "daemon restart", "daemon", "fail",
+      "fail NoSuchOperation", "fail TarnLib_Exit", "fail TarnLib_FreeTarnInfo",
+      "fail TarnVpExists --times 0", "fail TarnVpExists --after -1", "fail TarnVpExists --after",
+      "fail TarnVpExists --times 2x", "fail TarnVpExists --loud"};
+  // clang-format on
+  const std::string before = HyraSim::ExportScenario();
+  for (const char* arguments : refused) {
     const SimTest::ToolResult result = Hyrasim(arguments);
     EXPECT_NE(result.status, 0) << arguments;
-    EXPECT_NE(result.err.find("hyrasim: "), std::string::npos) << arguments;
+    EXPECT_EQ(result.err.rfind("hyrasim: ", 0), 0u) << arguments << ": " << result.err;
   }
   EXPECT_TRUE(HyraSim::ArmedFailures().empty()) << "nothing half written";
+  EXPECT_EQ(HyraSim::ExportScenario(), before);
+  EXPECT_EQ(Hyrasim("daemon stop").status, 0);
+  EXPECT_EQ(World()["daemon"]["running"], false);
 }
 
 TEST_F(Failures, DaemonCallsFailWithTheInjectedText) {
   Opened opened;
-  HyraSim::ArmFailure("TarnLib_ActivateProvider", Spec("array offline", 0, 1, false));
+  HyraSim::ArmFailure("TarnLib_ActivateProvider", {"array offline"});
   unsigned char block[TARNLIB_ACTIVATION_BLOCK_SIZE] = {};
   const TarnLib_Status status = TarnLib_ActivateProvider("array-a", "vp1", "", block);
   EXPECT_NE(status, 0);
@@ -82,7 +82,7 @@ TEST_F(Failures, DaemonCallsFailWithTheInjectedText) {
   EXPECT_TRUE(World()["daemon"]["activations"].empty()) << "the failed call had no effect";
   EXPECT_EQ(TarnLib_ActivateProvider("array-a", "vp1", "", block), 0);
 
-  HyraSim::ArmFailure("TarnLib_GetStorageContainer", Spec("no route to Tarnd", 0, 1, false));
+  HyraSim::ArmFailure("TarnLib_GetStorageContainer", {"no route to Tarnd"});
   StorageContainerResult* result = nullptr;
   const TarnLib_ErrorEx error = TarnLib_GetStorageContainer(1, nullptr, &result);
   EXPECT_FALSE(TarnLib_ErrorExIsSuccess(&error));
@@ -91,37 +91,21 @@ TEST_F(Failures, DaemonCallsFailWithTheInjectedText) {
   // A text longer than the record is cut before a whole character: 254 bytes
   // and a two-byte character would otherwise end on half of it.
   const std::string longText = std::string(254, 'x') + "\xC3\xA9" + "tail";
-  HyraSim::ArmFailure("TarnLib_GetStorageContainer", Spec(longText, 0, 1, false));
+  HyraSim::ArmFailure("TarnLib_GetStorageContainer", {longText});
   const TarnLib_ErrorEx cut = TarnLib_GetStorageContainer(1, nullptr, &result);
   EXPECT_EQ(std::string(TarnLib_ErrorExStr(&cut)), std::string(254, 'x'));
 
-  HyraSim::ArmFailure("TarnLib_Init", Spec("x", 0, 1, false));
+  HyraSim::ArmFailure("TarnLib_Init", {"x"});
   EXPECT_FALSE(TarnLib_Init(0, 0));
   EXPECT_EQ(TarnLibSim_Openings(), 1);
-  HyraSim::ArmFailure("TarnLib_NormalizeContainerIdString", Spec("x", 0, 1, true));
+  HyraSim::ArmFailure("TarnLib_NormalizeContainerIdString", {"x", 0, 1, true});
   char normal[TARNLIB_CONTAINER_ID_TEXT_SIZE];
   EXPECT_FALSE(TarnLib_NormalizeContainerIdString(SimTest::kGoldId, normal));
   EXPECT_TRUE(TarnLib_NormalizeContainerIdString(SimTest::kGoldId, normal));
 }
 
-TEST_F(Failures, HostOperationsFailWithoutEffect) {
-  StorageInfoImpl host;
-  HyraSim::ArmFailure("AddTarnFileSystem", Spec("mount refused", 0, 1, false));
-  std::string id = SimTest::kSilverId;
-  EXPECT_THROW(host.AddTarnFileSystem("silver", id, {}, true), HostCtlException);
-  HyraSim::ArmFailure("CreateConfigTarn", Spec("create refused", 0, 1, false));
-  TarnFileSystem* gold = host.GetTarnFileSystemByPath("/hyra/volumes/gold");
-  std::string path;
-  EXPECT_THROW(gold->CreateConfigTarn("new", "", 1, "", path, "", false), HostCtlException);
-  const auto world = World();
-  EXPECT_EQ(world["host"]["mounted"].size(), 1u);
-  EXPECT_EQ(world["containers"][0]["tarns"].size(), 2u);
-}
-
 TEST_F(Failures, NullAnswersNothingWithoutEffect) {
-  auto arm = [](const char* operation) {
-    HyraSim::ArmFailure(operation, Spec("unused", 0, 1, true));
-  };
+  auto arm = [](const char* operation) { HyraSim::ArmFailure(operation, {"unused", 0, 1, true}); };
   StorageInfoImpl host;
   TarnFileSystem* gold = host.GetTarnFileSystemByPath("/hyra/volumes/gold");
   ASSERT_NE(gold, nullptr);

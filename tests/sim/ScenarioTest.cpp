@@ -10,10 +10,8 @@
 
 namespace {
 
-using SimTest::FreshWorld;
 using Json = nlohmann::ordered_json;
-
-using Scenario = FreshWorld;
+using Scenario = SimTest::FreshWorld;
 
 // A scenario with every field given, so that reading and writing it again
 // must reproduce it exactly.
@@ -46,8 +44,12 @@ const char kFullScenario[] = R"json({
 })json";
 
 TEST_F(Scenario, InitThenShowGivesTheSameDocument) {
+  const std::string demo = HyraSim::ExportScenario();
+  HyraSim::InitScenario(demo);
+  EXPECT_EQ(HyraSim::ExportScenario(), demo);
+
   WriteFile("full.json", kFullScenario);
-  ASSERT_EQ(Hyrasim("init --scenario " + Path("full.json").string()).status, 0);
+  ASSERT_EQ(Hyrasim("init --scenario " + Path("full.json")).status, 0);
   const SimTest::ToolResult shown = Hyrasim("show --json");
   ASSERT_EQ(shown.status, 0);
   EXPECT_EQ(Json::parse(shown.out), Json::parse(kFullScenario));
@@ -55,16 +57,6 @@ TEST_F(Scenario, InitThenShowGivesTheSameDocument) {
   // And the exported text reads back to itself, byte for byte.
   HyraSim::InitScenario(shown.out);
   EXPECT_EQ(HyraSim::ExportScenario(), shown.out);
-}
-
-TEST_F(Scenario, DemoWorldRoundTripsAndHasWhatOthersRelyOn) {
-  const std::string demo = HyraSim::ExportScenario();
-  HyraSim::InitScenario(demo);
-  EXPECT_EQ(HyraSim::ExportScenario(), demo);
-  const Json world = Json::parse(demo);
-  EXPECT_EQ(world["containers"].size(), 4u);
-  EXPECT_EQ(world["host"]["mounted"][0]["name"], "gold");
-  EXPECT_EQ(world["host"]["providers"][1]["name"], "vp2");
 }
 
 TEST_F(Scenario, BadScenariosNameTheFieldAndChangeNothing) {
@@ -121,7 +113,7 @@ TEST_F(Scenario, BadScenariosNameTheFieldAndChangeNothing) {
   const std::string before = HyraSim::ExportScenario();
   for (const Case& c : cases) {
     WriteFile("bad.json", c.json);
-    const SimTest::ToolResult result = Hyrasim("init --scenario " + Path("bad.json").string());
+    const SimTest::ToolResult result = Hyrasim("init --scenario " + Path("bad.json"));
     EXPECT_NE(result.status, 0) << c.json;
     EXPECT_NE(result.err.find(c.error), std::string::npos) << result.err;
   }
@@ -130,12 +122,9 @@ TEST_F(Scenario, BadScenariosNameTheFieldAndChangeNothing) {
 
 TEST_F(Scenario, TextsThatAreNotUtf8AreStoredAndShownReplaced) {
   OskCtl::Storage::StorageInfoImpl host;
-  HostCtl::Storage::VendorProviderInfo provider;
-  provider.name = "vp\xff\xfe";
-  host.UpdateTarnVendorProvider({provider});
+  host.UpdateTarnVendorProvider({{"vp\xff\xfe", "", "", {}}});
   EXPECT_TRUE(host.TarnVpExists("vp\xff\xfe")) << "stored as given";
-  const Json world = Json::parse(HyraSim::ExportScenario());
-  EXPECT_EQ(world["host"]["providers"][2]["name"], "vp\xEF\xBF\xBD\xEF\xBF\xBD");
+  EXPECT_EQ(World()["host"]["providers"][2]["name"], "vp\xEF\xBF\xBD\xEF\xBF\xBD");
 }
 
 TEST_F(Scenario, DatabaseIsPrivateAndFollowsTheEnvironment) {
@@ -144,7 +133,7 @@ TEST_F(Scenario, DatabaseIsPrivateAndFollowsTheEnvironment) {
   EXPECT_EQ(info.st_mode & 0777, 0600u);
 
   // Without HYRA_SIM_DB the world lives below XDG_STATE_HOME, created on use.
-  const std::string state = Path("state").string();
+  const std::string state = Path("state");
   unsetenv("HYRA_SIM_DB");
   setenv("XDG_STATE_HOME", state.c_str(), 1);
   EXPECT_EQ(HyraSim::DatabasePath(), state + "/hyrasim/world.db");
@@ -158,18 +147,6 @@ TEST_F(Scenario, DatabaseIsPrivateAndFollowsTheEnvironment) {
   EXPECT_EQ(World()["daemon"]["running"], true);
 }
 
-TEST_F(Scenario, HyrasimRefusesWhatItCannotDo) {
-  const char* refused[] = {"bogus",       "init",           "init --scenario",
-                           "show --yaml", "daemon restart", "daemon"};
-  for (const char* arguments : refused) {
-    const SimTest::ToolResult result = Hyrasim(arguments);
-    EXPECT_NE(result.status, 0) << arguments;
-    EXPECT_EQ(result.err.rfind("hyrasim: ", 0), 0u) << arguments << ": " << result.err;
-  }
-  EXPECT_EQ(Hyrasim("daemon stop").status, 0);
-  EXPECT_EQ(World()["daemon"]["running"], false);
-}
-
 TEST_F(Scenario, FilesThatHoldNoWorldAreNeverTakenOver) {
   sqlite3* db = nullptr;
   ASSERT_EQ(sqlite3_open(Path("foreign.db").c_str(), &db), SQLITE_OK);
@@ -177,14 +154,14 @@ TEST_F(Scenario, FilesThatHoldNoWorldAreNeverTakenOver) {
   sqlite3_close(db);
   WriteFile("text.db", "not a database\n");
   for (const char* name : {"foreign.db", "text.db"}) {
-    const std::string before = ReadText(Path(name).string());
+    const std::string before = ReadText(Path(name));
     for (const char* command : {"show", "init --demo"}) {
       const SimTest::ToolResult result =
-          Run("HYRA_SIM_DB=" + Path(name).string() + " " + HYRASIM_PATH, command);
+          Run("HYRA_SIM_DB=" + Path(name) + " " + HYRASIM_PATH, command);
       EXPECT_EQ(result.status, 1) << name << " " << command;
-      EXPECT_NE(result.err.find(Path(name).string()), std::string::npos) << result.err;
+      EXPECT_NE(result.err.find(Path(name)), std::string::npos) << result.err;
     }
-    EXPECT_EQ(ReadText(Path(name).string()), before) << name;
+    EXPECT_EQ(ReadText(Path(name)), before) << name;
   }
 }
 
@@ -192,18 +169,12 @@ TEST_F(Scenario, SeveralProcessesWritingAtOnceLoseNothing) {
   std::string command = "(";
   for (int i = 0; i < 6; ++i) {
     command += std::string(SIM_PROBE_PATH) + " add-providers p" + std::to_string(i) + " 30 >>" +
-               Path("errors.txt").string() + " 2>&1 & ";
+               Path("errors.txt") + " 2>&1 & ";
   }
   command += "wait)";
   ASSERT_EQ(std::system(command.c_str()), 0);
-  EXPECT_EQ(ReadText(Path("errors.txt").string()), "");
-  OskCtl::Storage::StorageInfoImpl host;
-  for (int i = 0; i < 6; ++i) {
-    for (int j = 0; j < 30; ++j) {
-      const std::string name = "p" + std::to_string(i) + "-" + std::to_string(j);
-      EXPECT_TRUE(host.TarnVpExists(name)) << name;
-    }
-  }
+  EXPECT_EQ(ReadText(Path("errors.txt")), "");
+  // Provider names are unique, so the count shows that no update was lost.
   EXPECT_EQ(World()["host"]["providers"].size(), 2u + 6 * 30);
 }
 

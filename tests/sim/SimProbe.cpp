@@ -1,10 +1,6 @@
-// A small program that uses the stand-in host libraries from its own process,
-// so that tests can see what several processes do to one world.
-//
-//   sim_probe add-providers PREFIX COUNT   registers PREFIX-0 .. PREFIX-(COUNT-1)
-//   sim_probe vp-exists NAME               prints true or false
-//
-// A host failure is printed as "error: TEXT" with exit status 3.
+// Uses the stand-in host libraries from a process of its own, so that tests
+// see what several processes do to one world. A host failure is printed as
+// "error: TEXT" with exit status 3.
 #include <iostream>
 #include <string>
 

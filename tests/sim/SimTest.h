@@ -6,7 +6,6 @@
 #include <stdlib.h>
 #include <sys/wait.h>
 
-#include <cstdio>
 #include <filesystem>
 #include <fstream>
 #include <nlohmann/json.hpp>
@@ -29,8 +28,7 @@ constexpr const char* kSilverUnknownUnshared = "3e4f5a6b-7c8d-4e9f-a0b1-c2d3e4f5
 
 struct ToolResult {
   int status = -1;
-  std::string out;
-  std::string err;
+  std::string out, err;
 };
 
 class FreshWorld : public ::testing::Test {
@@ -43,43 +41,27 @@ class FreshWorld : public ::testing::Test {
     HyraSim::InitDemo();
     TarnLibSim_ResetCounters();
   }
+  void TearDown() override { std::filesystem::remove_all(dir_); }
 
-  void TearDown() override {
-    TarnLibSim_ResetCounters();
-    std::filesystem::remove_all(dir_);
-  }
-
-  std::filesystem::path Path(const std::string& name) const { return dir_ / name; }
-
+  std::string Path(const std::string& name) const { return (dir_ / name).string(); }
   void WriteFile(const std::string& name, const std::string& text) const {
     std::ofstream(Path(name), std::ios::binary) << text;
   }
-
-  // Runs a program of the build (hyrasim, sim_probe) with arguments given as
-  // one shell-quoted text.
-  ToolResult Run(const std::string& program, const std::string& arguments) const {
-    const std::string out = Path("out.txt").string();
-    const std::string err = Path("err.txt").string();
-    const std::string command = program + " " + arguments + " >" + out + " 2>" + err;
-    ToolResult result;
-    const int raw = std::system(command.c_str());
-    result.status = WIFEXITED(raw) ? WEXITSTATUS(raw) : -1;
-    result.out = ReadText(out);
-    result.err = ReadText(err);
-    return result;
-  }
-
-  ToolResult Hyrasim(const std::string& arguments) const { return Run(HYRASIM_PATH, arguments); }
-  ToolResult Probe(const std::string& arguments) const { return Run(SIM_PROBE_PATH, arguments); }
-
   static std::string ReadText(const std::string& path) {
-    std::ifstream file(path, std::ios::binary);
     std::ostringstream text;
-    text << file.rdbuf();
+    text << std::ifstream(path, std::ios::binary).rdbuf();
     return text.str();
   }
 
-  // The world as a JSON value.
+  // Runs a program of the build with arguments given as one shell-quoted text.
+  ToolResult Run(const std::string& program, const std::string& arguments) const {
+    const int raw =
+        std::system((program + " " + arguments + " >" + Path("out") + " 2>" + Path("err")).c_str());
+    return {WIFEXITED(raw) ? WEXITSTATUS(raw) : -1, ReadText(Path("out")), ReadText(Path("err"))};
+  }
+  ToolResult Hyrasim(const std::string& arguments) const { return Run(HYRASIM_PATH, arguments); }
+  ToolResult Probe(const std::string& arguments) const { return Run(SIM_PROBE_PATH, arguments); }
+
   static nlohmann::ordered_json World() {
     return nlohmann::ordered_json::parse(HyraSim::ExportScenario());
   }
@@ -87,19 +69,15 @@ class FreshWorld : public ::testing::Test {
   std::filesystem::path dir_;
 };
 
-// Opens the daemon client library for one test scope.
-class Opened {
- public:
-  Opened() : ok_(TarnLib_Init(0, 0)) {}
+// Holds one opening of the daemon client library for a test scope.
+struct Opened {
+  Opened() : ok(TarnLib_Init(0, 0)) {}
   ~Opened() {
-    if (ok_) TarnLib_Exit();
+    if (ok) TarnLib_Exit();
   }
   Opened(const Opened&) = delete;
   Opened& operator=(const Opened&) = delete;
-  bool ok() const { return ok_; }
-
- private:
-  bool ok_;
+  const bool ok;
 };
 
 }  // namespace SimTest

@@ -1,5 +1,5 @@
 // The storage-control library against the demo world: providers, mounts,
-// config-tarns, endpoint events and the Kiro context.
+// config-tarns and endpoint events.
 #include <memory>
 #include <string>
 #include <vector>
@@ -15,9 +15,7 @@ using HostCtl::Lib::HostCtlException;
 using HostCtl::Storage::TarnFileSystem;
 using OskCtl::Storage::StorageInfoImpl;
 using OskCtl::Storage::TarnFileSystemImpl;
-using SimTest::FreshWorld;
-
-using StorageControl = FreshWorld;
+using StorageControl = SimTest::FreshWorld;
 
 // The file systems GetTarnFileSystems answers, owned.
 std::vector<std::unique_ptr<TarnFileSystem> > Mounted(StorageInfoImpl& host) {
@@ -37,13 +35,8 @@ std::string MessageOf(const std::function<void()>& action) {
 
 TEST_F(StorageControl, ProviderUpdateReplacesWholeRecordsByName) {
   StorageInfoImpl host;
-  HostCtl::Storage::VendorProviderInfo vp1;
-  vp1.name = "vp1";
-  vp1.url = "https://new.example.test/kiro";
-  HostCtl::Storage::VendorProviderInfo vp3;
-  vp3.name = "vp3";
-  vp3.arrays.push_back({"array-x", false, -7});
-  host.UpdateTarnVendorProvider({vp1, vp3});
+  host.UpdateTarnVendorProvider({{"vp1", "https://new.example.test/kiro", "", {}},
+                                 {"vp3", "", "", {{"array-x", false, -7}}}});
 
   std::vector<HostCtl::Storage::VendorProviderInfo> found;
   host.GetTarnVendorProviders("vp1", found);
@@ -64,7 +57,7 @@ TEST_F(StorageControl, ProviderUpdateReplacesWholeRecordsByName) {
   EXPECT_EQ(providers[0]["name"], "vp1") << "an update keeps the provider's place";
 }
 
-TEST_F(StorageControl, MountKeepsIdAsGivenAndFindsByPathAndNormalId) {
+TEST_F(StorageControl, MountKeepsIdAsGivenAnswersForItsTarnsAndIsFoundByPath) {
   StorageInfoImpl host;
   std::string id = "9B8A7C6D5E4F4A3B8C2D1E0F9A8B7C6D";
   std::unique_ptr<TarnFileSystem> silver(host.AddTarnFileSystem("silver", id, {"array-a"}, true));
@@ -73,6 +66,14 @@ TEST_F(StorageControl, MountKeepsIdAsGivenAndFindsByPathAndNormalId) {
   EXPECT_EQ(silver->GetContainerIdText(), SimTest::kSilverId);
   EXPECT_TRUE(silver->MatchesContainerId(SimTest::kSilverId));
   EXPECT_FALSE(silver->MatchesContainerId(SimTest::kGoldId));
+  // Accessibility is the stored state of tarns of this container only.
+  EXPECT_EQ(silver->CheckTarnAccessibility({SimTest::kSilverUnknownUnshared,
+                                            "4a5b6c7d-8e9f-4a0b-b1c2-d3e4f5a6b7c8",
+                                            SimTest::kGoldTarn, SimTest::kSilverUnknownUnshared}),
+            (std::vector<HostCtl::Storage::TarnAccessibilityType>{
+                HostCtl::Storage::TARN_INACCESSIBLE, HostCtl::Storage::TARN_UNCONFIRMED,
+                HostCtl::Storage::TARN_NON_EXISTENT, HostCtl::Storage::TARN_INACCESSIBLE}));
+  EXPECT_TRUE(silver->CheckTarnAccessibility({}).empty());
   EXPECT_EQ(MessageOf([&] { host.AddTarnFileSystem("silver", id, {}, true); }),
             "A container file system named silver is already mounted at /hyra/volumes/silver");
 
@@ -92,15 +93,10 @@ TEST_F(StorageControl, MountKeepsIdAsGivenAndFindsByPathAndNormalId) {
   }
 
   host.RemoveTarnFileSystem(SimTest::kSilverId);
-  EXPECT_EQ(Mounted(host).size(), 1u);
   EXPECT_EQ(MessageOf([&] { host.RemoveTarnFileSystem(SimTest::kSilverId); }),
             std::string("No container file system with id ") + SimTest::kSilverId + " is mounted");
-}
-
-TEST_F(StorageControl, UnsafeMountNamesAreRefused) {
-  StorageInfoImpl host;
+  // Names that would leave /hyra/volumes are refused.
   for (const char* name : {"", ".", "..", "a/b", "../etc"}) {
-    std::string id = SimTest::kSilverId;
     EXPECT_THROW(host.AddTarnFileSystem(name, id, {}, true), HostCtlException) << name;
   }
   EXPECT_EQ(Mounted(host).size(), 1u);
@@ -178,19 +174,6 @@ TEST_F(StorageControl, ConfigTarnRefusals) {
             "The container file system legacy is no longer mounted");
 }
 
-TEST_F(StorageControl, AccessibilityIsTheStoredStateOfTarnsOfThisContainer) {
-  StorageInfoImpl host;
-  std::string id = SimTest::kSilverId;
-  std::unique_ptr<TarnFileSystem> silver(host.AddTarnFileSystem("silver", id, {}, true));
-  const auto states = silver->CheckTarnAccessibility(
-      {SimTest::kSilverUnknownUnshared, "4a5b6c7d-8e9f-4a0b-b1c2-d3e4f5a6b7c8", SimTest::kGoldTarn,
-       SimTest::kSilverUnknownUnshared});
-  EXPECT_EQ(states, (std::vector<HostCtl::Storage::TarnAccessibilityType>{
-                        HostCtl::Storage::TARN_INACCESSIBLE, HostCtl::Storage::TARN_UNCONFIRMED,
-                        HostCtl::Storage::TARN_NON_EXISTENT, HostCtl::Storage::TARN_INACCESSIBLE}));
-  EXPECT_TRUE(silver->CheckTarnAccessibility({}).empty());
-}
-
 TEST_F(StorageControl, EndpointEventsMarkTheEndpointAndNameMountedContainersInMountOrder) {
   StorageInfoImpl host;
   std::string silverId = SimTest::kSilverId;
@@ -214,13 +197,6 @@ TEST_F(StorageControl, EndpointEventsMarkTheEndpointAndNameMountedContainersInMo
                                                    containers);
             }),
             "No protocol endpoint has the local UID pe-zz");
-}
-
-TEST_F(StorageControl, KiroContextIsKeptAndCleared) {
-  TarnFileSystemImpl::SetKiroContext("zm-1234");
-  EXPECT_EQ(World()["host"]["kiroContext"], "zm-1234");
-  TarnFileSystemImpl::ClearKiroContext();
-  EXPECT_TRUE(World()["host"]["kiroContext"].is_null());
 }
 
 }  // namespace
