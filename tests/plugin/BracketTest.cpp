@@ -36,9 +36,9 @@ struct Bracketed {
   std::function<boost::shared_ptr<Command>()> make;
 };
 
-template <typename T>
+template <typename C>
 std::function<boost::shared_ptr<Command>()> Maker() {
-  return [] { return T::New(); };
+  return [] { return C::New(); };
 }
 
 void ExpectInitFailure(const std::function<void()>& action, const Bracketed& c) {
@@ -48,9 +48,7 @@ void ExpectInitFailure(const std::function<void()>& action, const Bracketed& c) 
   } catch (const OskCtl::Lib::OskCtlException& e) {
     EXPECT_EQ(e.GetMessage(false), "Unable to initialize tarnLib");
     EXPECT_EQ(e.GetSourceFile(), c.source);
-    if (c.line != 0) {
-      EXPECT_EQ(e.GetLine(), c.line);
-    }
+    EXPECT_EQ(e.GetLine(), c.line != 0 ? c.line : e.GetLine());
     EXPECT_GT(e.GetLine(), 0);
   }
 }
@@ -72,13 +70,12 @@ TEST_F(BracketTest, ConstructorBracketHoldsTheLibraryForTheObjectsLife) {
       {"internal/CGSync", 52, Maker<CGSync>()},
   };
   for (const Bracketed& c : cases) {
-    SCOPED_TRACE(c.source);
     TarnLibSim_ResetCounters();
     boost::shared_ptr<Command> command = c.make();
     EXPECT_EQ(TarnLibSim_Openings(), 1);
     command.reset();
-    EXPECT_EQ(TarnLibSim_Openings(), 0);
     EXPECT_EQ(TarnLibSim_ExitCalls(), 1);
+    EXPECT_EQ(TarnLibSim_Openings(), 0);
 
     // A failed opening leaves no object, so nothing is released for it.
     TarnLibSim_ResetCounters();
@@ -90,43 +87,32 @@ TEST_F(BracketTest, ConstructorBracketHoldsTheLibraryForTheObjectsLife) {
 }
 
 TEST_F(BracketTest, InvocationBracketReleasesOnceOnEveryWayOut) {
-  struct Case {
-    Bracketed command;
-    // The sink call that an invocation without parameters reaches; the sink
-    // throws from it to leave the invocation by an exception.
-    RecordingOutput::ThrowOn reached;
+  using T = RecordingOutput::ThrowOn;
+  // With each, the sink call that an invocation without parameters reaches;
+  // the sink throws from it to leave the invocation by an exception.
+  const std::pair<Bracketed, T> cases[] = {
+      {{"internal/FaultInjectionEnable", 0, Maker<FaultInjectionEnable>()}, T::kResult},
+      {{"internal/FaultInjectionRuleAdd", 0, Maker<FaultInjectionRuleAdd>()}, T::kError},
+      {{"internal/FaultInjectionRuleSet", 0, Maker<FaultInjectionRuleSet>()}, T::kError},
+      {{"internal/FaultInjectionRuleRemove", 0, Maker<FaultInjectionRuleRemove>()}, T::kError},
+      {{"internal/VirtualVolumeGet", 102, Maker<VirtualVolumeGet>()}, T::kError},
+      {{"internal/VirtualVolumeMetaDataList", 88, Maker<VirtualVolumeMetaDataList>()}, T::kError},
   };
-  const RecordingOutput::ThrowOn kError = RecordingOutput::ThrowOn::kError;
-  const Case cases[] = {
-      {{"internal/FaultInjectionEnable", 0, Maker<FaultInjectionEnable>()},
-       RecordingOutput::ThrowOn::kResult},
-      {{"internal/FaultInjectionRuleAdd", 0, Maker<FaultInjectionRuleAdd>()}, kError},
-      {{"internal/FaultInjectionRuleSet", 0, Maker<FaultInjectionRuleSet>()}, kError},
-      {{"internal/FaultInjectionRuleRemove", 0, Maker<FaultInjectionRuleRemove>()}, kError},
-      {{"internal/VirtualVolumeGet", 102, Maker<VirtualVolumeGet>()}, kError},
-      {{"internal/VirtualVolumeMetaDataList", 88, Maker<VirtualVolumeMetaDataList>()}, kError},
-  };
-  for (const Case& c : cases) {
-    SCOPED_TRACE(c.command.source);
-    boost::shared_ptr<Command> command = c.command.make();
-
+  for (const auto& [bracketed, reached] : cases) {
+    boost::shared_ptr<Command> command = bracketed.make();
     TarnLibSim_ResetCounters();
-    command->Execute(MakeInput(nullptr), RecordingOutput::New());
-    EXPECT_EQ(TarnLibSim_InitCalls(), 1);
+    RunCommand(*command, nullptr);
     EXPECT_EQ(TarnLibSim_ExitCalls(), 1);
-
     // An exception from inside the invocation still releases the library.
-    TarnLibSim_ResetCounters();
-    EXPECT_THROW(command->Execute(MakeInput(nullptr), RecordingOutput::New(c.reached)),
-                 HostCtl::Lib::HostCtlException);
-    EXPECT_EQ(TarnLibSim_InitCalls(), 1);
-    EXPECT_EQ(TarnLibSim_ExitCalls(), 1);
+    EXPECT_THROW(RunCommand(*command, nullptr, reached), HostCtl::Lib::HostCtlException);
+    EXPECT_EQ(TarnLibSim_InitCalls(), 2);
+    EXPECT_EQ(TarnLibSim_ExitCalls(), 2);
 
     TarnLibSim_ResetCounters();
     Arm("TarnLib_Init");
     boost::shared_ptr<RecordingOutput> output = RecordingOutput::New();
-    ExpectInitFailure([&] { command->Execute(MakeInput(nullptr), output); }, c.command);
-    EXPECT_TRUE(output->Calls().empty());
+    ExpectInitFailure([&] { command->Execute(Fendle::CallSpec::Input::New(), output); }, bracketed);
+    EXPECT_TRUE(output->GetCalls().empty());
     EXPECT_EQ(TarnLibSim_ExitCalls(), 0);
     EXPECT_EQ(TarnLibSim_Openings(), 0);
   }

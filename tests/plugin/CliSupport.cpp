@@ -2,7 +2,6 @@
 
 #include <sys/wait.h>
 
-#include <cstdio>
 #include <cstdlib>
 #include <filesystem>
 #include <fstream>
@@ -15,6 +14,12 @@ std::string Quoted(const std::string& word) {
   std::string quoted = "'";
   for (char c : word) quoted += (c == '\'') ? std::string("'\\''") : std::string(1, c);
   return quoted + "'";
+}
+
+std::string ReadFile(const std::string& path) {
+  std::ostringstream text;
+  text << std::ifstream(path).rdbuf();
+  return text.str();
 }
 
 }  // namespace
@@ -42,22 +47,12 @@ void CliTest::TearDown() {
 }
 
 Outcome CliTest::Tool(const char* path, const std::vector<std::string>& args) {
-  const std::string errPath = directory_ + "/stderr";
+  const std::string outPath = directory_ + "/stdout", errPath = directory_ + "/stderr";
   std::string command = Quoted(path);
   for (const auto& arg : args) command += " " + Quoted(arg);
-  command += " 2>" + Quoted(errPath);
-  Outcome outcome{-1, "", ""};
-  FILE* pipe = popen(command.c_str(), "r");
-  if (pipe == nullptr) return outcome;
-  char buffer[4096];
-  for (size_t n; (n = fread(buffer, 1, sizeof buffer, pipe)) > 0;) outcome.out.append(buffer, n);
-  const int status = pclose(pipe);
-  outcome.status = WIFEXITED(status) ? WEXITSTATUS(status) : -1;
-  std::ifstream err(errPath);
-  std::ostringstream text;
-  text << err.rdbuf();
-  outcome.err = text.str();
-  return outcome;
+  const int status =
+      std::system((command + " >" + Quoted(outPath) + " 2>" + Quoted(errPath)).c_str());
+  return {WIFEXITED(status) ? WEXITSTATUS(status) : -1, ReadFile(outPath), ReadFile(errPath)};
 }
 
 Outcome CliTest::Tarn(std::vector<std::string> args,

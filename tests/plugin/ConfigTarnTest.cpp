@@ -1,6 +1,5 @@
 // The config-tarn commands and kirocontext set against the simulated host.
 #include <fstream>
-#include <map>
 
 #include "ConfigTarnAdd.h"
 #include "ConfigTarnMountdir.h"
@@ -17,31 +16,15 @@ namespace {
 
 using namespace HalvikCli::TarnNamespace;
 using nlohmann::json;
-typedef std::vector<std::string> Calls;
 
 const std::string kGold = "6f1c2f4e-8d3b-4c1a-9e2f-0a1b2c3d4e5f";
 const std::string kSilver = "9b8a7c6d-5e4f-4a3b-8c2d-1e0f9a8b7c6d";      // not mounted
 const std::string kConfigUuid = "5d2f7a10-6b1c-4e3d-9a8b-7c6d5e4f3a2b";  // vm-config-1 in gold
 const Calls kTrue{"result: true", "finish"};
 
-// Options by long name; clear and priority are switches, given by naming them.
-InputFiller Given(std::map<std::string, std::string> options) {
-  return [=](Fendle::CallSpec::Input& in) {
-    for (const auto& o : options) {
-      if (o.first == "clear" || o.first == "priority") {
-        in.SetFlag(o.first);
-      } else if (o.first == "size") {
-        in.SetInt(o.first, std::stoll(o.second));
-      } else {
-        in.SetString(o.first, o.second);
-      }
-    }
-  };
-}
-
 // Gold's config-tarn of that directory name as [policy, vmUuid, size, mounted], or null.
 json InGold(const std::string& name) {
-  const json world = nlohmann::json::parse(HyraSim::ExportScenario());
+  const json world = json::parse(HyraSim::ExportScenario());
   for (const json& t : world["containers"][0]["tarns"]) {
     const json& c = t.value("configTarn", json::object());
     if (c.value("name", "") == name)
@@ -53,48 +36,40 @@ json InGold(const std::string& name) {
 class ConfigTarnTest : public SimWorldTest {};
 
 TEST_F(ConfigTarnTest, AddSendsPolicySizeAndVmUuidOrRefuses) {
-  const std::string file = directory_ + "/policy", missing = directory_ + "/missing";
-  std::ofstream(file) << "first policy\nsecond\n";
+  const std::string missing = directory_ + "/missing";
   std::ofstream(directory_ + "/empty");
   auto refused = [](const std::string& why) { return Calls{"error: " + why, "result: false"}; };
   const struct {
-    std::map<std::string, std::string> options;
+    json options;
     const char* armed;  // armed to fail with "boom"
     Calls calls;
     json stored;
   } cases[] = {
-      {{{"policy", "p"}, {"vmuuid", "vm"}, {"size", "1024"}, {"priority", ""}},
-       nullptr,
-       kTrue,
+      // clang-format off
+      {{{"policy", "p"}, {"vmuuid", "vm"}, {"size", 1024}, {"priority", nullptr}}, nullptr, kTrue,
        {"p", "vm", 1024, false}},
-      {{}, nullptr, kTrue, {"", "", 0, false}},
-      {{{"policy-file", file}, {"policy", "p"}}, nullptr, kTrue, {"first policy", "", 0, false}},
+      {json::object(), nullptr, kTrue, {"", "", 0, false}},
       {{{"policy-file", directory_ + "/empty"}}, nullptr, kTrue, {"", "", 0, false}},
-      {{{"policy-file", missing}},
-       "GetTarnFileSystems",
-       refused("Unable to read policy file " + missing),
+      // Refused before the host is asked.
+      {{{"policy-file", missing}}, "GetTarnFileSystems",
+       refused("Unable to read policy file " + missing), nullptr},
+      {{{"policy-file", directory_}}, nullptr, refused("Unable to read policy file " + directory_),
        nullptr},
-      {{{"policy-file", directory_}},
-       nullptr,
-       refused("Unable to read policy file " + directory_),
-       nullptr},
-      {{{"container-id", kSilver}},
-       nullptr,
-       refused("Failed to find Tarn StorageContainer " + kSilver),
-       nullptr},
-      {{}, "CreateConfigTarn", {"error: Failed to create Config-Tarn. boom"}, nullptr},
+      {{{"container-id", kSilver}}, nullptr,
+       refused("Failed to find Tarn StorageContainer " + kSilver), nullptr},
+      {json::object(), "CreateConfigTarn", {"error: Failed to create Config-Tarn. boom"}, nullptr},
+      // clang-format on
   };
   for (const auto& c : cases) {
-    SCOPED_TRACE(c.calls[0]);
     HyraSim::InitDemo();
     if (c.armed) Arm(c.armed, "boom");
-    std::map<std::string, std::string> options{{"name", "cfg"}, {"container-id", kGold}};
-    for (const auto& o : c.options) options[o.first] = o.second;
-    EXPECT_EQ(RunCommand(*ConfigTarnAdd::New(), Given(options)), c.calls);
+    json options = {{"name", "cfg"}, {"container-id", kGold}};
+    options.update(c.options);
+    EXPECT_EQ(RunCommand(*ConfigTarnAdd::New(), Args(options)), c.calls);
     EXPECT_EQ(InGold("cfg"), c.stored);
   }
   Arm("MatchesContainerId");  // not handled by add
-  EXPECT_THROW(RunCommand(*ConfigTarnAdd::New(), Given({{"container-id", kGold}})),
+  EXPECT_THROW(RunCommand(*ConfigTarnAdd::New(), Args({{"container-id", kGold}})),
                HostCtl::Lib::HostCtlException);
 }
 
@@ -111,14 +86,13 @@ TEST_F(ConfigTarnTest, MountUmountAndRemoveReportTheirOwnTexts) {
   };
   const json before = World();
   for (const auto& t : twins) {
-    SCOPED_TRACE(t.operation);
-    EXPECT_EQ(RunCommand(*t.command, Given({{"container-id", kSilver}})),
+    EXPECT_EQ(RunCommand(*t.command, Args({{"container-id", kSilver}})),
               (Calls{"error: " + t.missingName, "result: false"}));
-    EXPECT_EQ(RunCommand(*t.command, Given({{"container-id", kSilver}, {"name", "vm-config-1"}})),
+    EXPECT_EQ(RunCommand(*t.command, Args({{"container-id", kSilver}, {"name", "vm-config-1"}})),
               (Calls{"error: Failed to find Tarn StorageContainer " + kSilver, "result: false"}));
     for (const char* armed : {"MatchesContainerId", t.operation}) {
       Arm(armed, "boom");
-      EXPECT_EQ(RunCommand(*t.command, Given({{"container-id", kGold}, {"uuid", kConfigUuid}})),
+      EXPECT_EQ(RunCommand(*t.command, Args({{"container-id", kGold}, {"uuid", kConfigUuid}})),
                 Calls{"error: boom"});
     }
   }
@@ -133,7 +107,7 @@ TEST_F(ConfigTarnTest, TheFirstMatchingContainerIsNamedByUuidBeforeName) {
   LoadScenario(world);
   Arm("MatchesContainerId", "asked twice", 1);  // the walk ends at the first match
   EXPECT_EQ(RunCommand(*ConfigTarnMountdir::New(),
-                       Given({{"container-id", kGold}, {"uuid", kConfigUuid}, {"name", "none"}})),
+                       Args({{"container-id", kGold}, {"uuid", kConfigUuid}, {"name", "none"}})),
             kTrue);
   EXPECT_EQ(InGold("vm-config-1")[3], true);
 }
@@ -145,23 +119,22 @@ TEST_F(ConfigTarnTest, KiroContextEndsEveryPathWithFinish) {
   };
   const Calls neitherOrBoth = refused("Exactly one of --clear or --uuid must be specified!");
   const struct {
-    InputFiller input;
+    json args;
     const char* armed;  // armed to fail with "locked"
     Calls calls;
     json context;
   } cases[] = {
-      {Given({{"uuid", " ZM-1 "}}), nullptr, kTrue, " ZM-1 "},
-      {Given({{"clear", ""}}), nullptr, kTrue, nullptr},
-      {Given({{"clear", ""}, {"uuid", "zm"}}), nullptr, neitherOrBoth, "old"},
-      {nullptr, nullptr, neitherOrBoth, "old"},
-      {Given({{"uuid", ""}}), nullptr, refused("--uuid requires a parameter"), "old"},
-      {Given({{"uuid", "zm"}}), "SetKiroContext", refused("locked"), "old"},
+      {{{"uuid", " ZM-1 "}}, nullptr, kTrue, " ZM-1 "},
+      {{{"clear", nullptr}}, nullptr, kTrue, nullptr},
+      {{{"clear", nullptr}, {"uuid", "zm"}}, nullptr, neitherOrBoth, "old"},
+      {json::object(), nullptr, neitherOrBoth, "old"},
+      {{{"uuid", ""}}, nullptr, refused("--uuid requires a parameter"), "old"},
+      {{{"uuid", "zm"}}, "SetKiroContext", refused("locked"), "old"},
   };
   for (const auto& c : cases) {
-    SCOPED_TRACE(c.calls[0]);
     OskCtl::Storage::TarnFileSystemImpl::SetKiroContext("old");
     if (c.armed) Arm(c.armed, "locked");
-    EXPECT_EQ(RunCommand(*KiroContextSet::New(), c.input), c.calls);
+    EXPECT_EQ(RunCommand(*KiroContextSet::New(), Args(c.args)), c.calls);
     EXPECT_EQ(World()["host"]["kiroContext"], c.context);
   }
 }

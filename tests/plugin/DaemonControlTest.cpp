@@ -13,24 +13,9 @@ namespace {
 
 using namespace HalvikCli::TarnNamespace;
 using nlohmann::json;
-typedef std::vector<std::string> Calls;
 
 const Calls kTrue = {"result: true", "finish"};
 const std::string kRange = " is outside the range -2147483648 to 2147483647";
-
-// Parameters given as a JSON object; the kind of each value picks the setter,
-// null marking a flag.
-InputFiller Args(const char* args) {
-  return [=](Fendle::CallSpec::Input& in) {
-    const json parsed = json::parse(args);
-    for (const auto& [name, value] : parsed.items()) {
-      if (value.is_string()) in.SetString(name, value);
-      if (value.is_number()) in.SetInt(name, value);
-      if (value.is_boolean()) in.SetBool(name, value);
-      if (value.is_null()) in.SetFlag(name);
-    }
-  };
-}
 
 json Rules(const std::vector<json>& rules) { return {{"faultInjection", {{"rules", rules}}}}; }
 json Rule(const char* operation, const char* fault, int32_t frequency, int32_t time) {
@@ -39,7 +24,7 @@ json Rule(const char* operation, const char* fault, int32_t frequency, int32_t t
 
 struct Case {
   boost::shared_ptr<Fendle::AutoCli::Command> command;
-  const char* args;
+  const char* args;  // a JSON object
   Calls calls;
   json change = nullptr;        // merged into the daemon's state; null: no change
   const char* armed = nullptr;  // a daemon function armed to fail with "busy"
@@ -56,7 +41,7 @@ class DaemonControlTest : public SimWorldTest {
       world["daemon"].merge_patch(start);
       LoadScenario(world);
       if (c.armed) Arm(c.armed, "busy");
-      EXPECT_EQ(RunCommand(*c.command, Args(c.args)), c.calls);
+      EXPECT_EQ(RunCommand(*c.command, Args(json::parse(c.args))), c.calls);
       if (!c.change.is_null()) world["daemon"].merge_patch(c.change);
       EXPECT_EQ(World()["daemon"], world["daemon"]);
     }

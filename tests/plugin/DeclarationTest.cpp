@@ -14,7 +14,6 @@
 #include "CGSync.h"
 #include "DaemonCommand.h"
 #include "PluginTestSupport.h"
-#include "StorageContainerLoad.h"
 #include "TarnLibSim.h"
 #include "TarnNamespace.h"
 
@@ -274,22 +273,6 @@ TEST_F(DeclarationTest, LogLevelWordsMapToTheDaemonsNumbers) {
   for (const auto& c : cases) {
     EXPECT_EQ(command->GetLogLevelInt(c.first), c.second) << '"' << c.first << '"';
   }
-}
-
-TEST_F(DeclarationTest, StorageArrayListKeepsTheRecordsAndTheirEndpointLinesInOrder) {
-  boost::shared_ptr<StorageContainerLoad> command = StorageContainerLoad::New();
-  const std::vector<SAInfo> arrays = {
-      {"a1", "one", "v1", "m1", {"PE #0 (x)", "PE #1 (y)"}},
-      {"a2", "two", "v2", "m2", {}},
-  };
-  const std::string prototype =
-      "<Array{ArrayId=\"\",Name=\"\",VendorId=\"\",ModelId=\"\",PEInfo=[]}>";
-  EXPECT_EQ(Describe(command->GetStorageArrayList({})), "[" + prototype + "]");
-  EXPECT_EQ(Describe(command->GetStorageArrayList(arrays)),
-            "[" + prototype +
-                "Array{ArrayId=\"a1\",Name=\"one\",VendorId=\"v1\",ModelId=\"m1\","
-                "PEInfo=[\"PE #0 (x)\",\"PE #1 (y)\"]},"
-                "Array{ArrayId=\"a2\",Name=\"two\",VendorId=\"v2\",ModelId=\"m2\",PEInfo=[]}]");
 }
 
 }  // namespace

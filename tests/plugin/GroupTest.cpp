@@ -17,7 +17,6 @@ namespace {
 
 using namespace HalvikCli::TarnNamespace;
 using Fendle::CallSpec::Input;
-typedef std::vector<std::string> Calls;
 typedef boost::shared_ptr<Fendle::AutoCli::Command> CommandPtr;
 
 void AnyGroupInput(Input& in) {
@@ -47,15 +46,13 @@ TEST_F(GroupTest, CreateListAndSyncReleaseWhatEachExecutionOpened) {
        1},
   };
   for (const auto& c : cases) {
-    SCOPED_TRACE(c.result);
     TarnLibSim_ResetCounters();
     CommandPtr command = c.make();
     for (int run = 0; run < 2; ++run) {
       EXPECT_EQ(RunCommand(*command, AnyGroupInput), (Calls{"result: " + c.result, "finish"}));
       EXPECT_EQ(TarnLibSim_Openings(), c.heldByObject);
     }
-    EXPECT_THROW(command->Execute(MakeInput(AnyGroupInput),
-                                  RecordingOutput::New(RecordingOutput::ThrowOn::kResult)),
+    EXPECT_THROW(RunCommand(*command, AnyGroupInput, RecordingOutput::ThrowOn::kResult),
                  HostCtl::Lib::HostCtlException);
     EXPECT_EQ(TarnLibSim_Openings(), c.heldByObject);
     Arm("TarnLib_Init", "daemon gone");

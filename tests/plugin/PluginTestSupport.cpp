@@ -3,6 +3,7 @@
 #include <cstdlib>
 #include <filesystem>
 #include <sstream>
+#include <utility>
 
 #include "HostCtl/Lib.h"
 #include "TarnLibSim.h"
@@ -10,92 +11,81 @@
 
 namespace PluginTest {
 
-using Fendle::MetaObj::MetaObject;
-using Fendle::MetaObj::MetaType;
+using namespace Fendle::MetaObj;
 
 std::string Describe(const boost::shared_ptr<MetaObject>& value) {
-  if (!value) return "null";
   std::ostringstream text;
-  switch (value->GetType()) {
-    case MetaType::Bool: {
-      auto b = boost::dynamic_pointer_cast<Fendle::MetaObj::MetaBool>(value);
-      text << (!b->HasValue() ? "bool" : b->GetValue() ? "true" : "false");
-      break;
+  const char* separator = "";
+  if (auto b = boost::dynamic_pointer_cast<MetaBool>(value)) {
+    text << (!b->HasValue() ? "bool" : b->GetValue() ? "true" : "false");
+  } else if (auto i = boost::dynamic_pointer_cast<MetaInt>(value)) {
+    text << i->GetValue();
+  } else if (auto s = boost::dynamic_pointer_cast<MetaString>(value)) {
+    text << '"' << s->GetValue() << '"';
+  } else if (auto st = boost::dynamic_pointer_cast<MetaStruct>(value)) {
+    text << st->GetName() << '{';
+    for (const auto& field : st->GetFields()) {
+      text << std::exchange(separator, ",") << field.first << '=' << Describe(field.second);
     }
-    case MetaType::Int:
-      text << boost::dynamic_pointer_cast<Fendle::MetaObj::MetaInt>(value)->GetValue();
-      break;
-    case MetaType::String:
-      text << '"' << boost::dynamic_pointer_cast<Fendle::MetaObj::MetaString>(value)->GetValue()
-           << '"';
-      break;
-    case MetaType::Struct: {
-      auto s = boost::dynamic_pointer_cast<Fendle::MetaObj::MetaStruct>(value);
-      text << s->GetName() << '{';
-      const char* separator = "";
-      for (const auto& field : s->GetFields()) {
-        text << separator << field.first << '=' << Describe(field.second);
-        separator = ",";
-      }
-      text << '}';
-      break;
+    text << '}';
+  } else if (auto l = boost::dynamic_pointer_cast<MetaList>(value)) {
+    text << '[';
+    if (l->GetPrototype()) text << '<' << Describe(l->GetPrototype()) << '>';
+    for (const auto& element : l->GetElements()) {
+      text << std::exchange(separator, ",") << Describe(element);
     }
-    case MetaType::List: {
-      auto l = boost::dynamic_pointer_cast<Fendle::MetaObj::MetaList>(value);
-      text << '[';
-      if (l->GetPrototype()) text << '<' << Describe(l->GetPrototype()) << '>';
-      const char* separator = "";
-      for (const auto& element : l->GetElements()) {
-        text << separator << Describe(element);
-        separator = ",";
-      }
-      text << ']';
-      break;
-    }
+    text << ']';
+  } else {
+    text << "null";
   }
   return text.str();
 }
 
-boost::shared_ptr<RecordingOutput> RecordingOutput::New(ThrowOn throwOn,
-                                                        const std::string& message) {
-  return boost::shared_ptr<RecordingOutput>(new RecordingOutput(throwOn, message));
+InputFiller Args(const nlohmann::json& args) {
+  return [args](Fendle::CallSpec::Input& in) {
+    for (const auto& [name, value] : args.items()) {
+      if (value.is_string()) in.SetString(name, value);
+      if (value.is_number()) in.SetInt(name, value);
+      if (value.is_boolean()) in.SetBool(name, value);
+      if (value.is_null()) in.SetFlag(name);
+      for (const auto& element : value.is_array() ? value : nlohmann::json::array()) {
+        if (element.is_string()) in.AddString(name, element);
+        if (element.is_number()) in.AddInt(name, element);
+        if (element.is_boolean()) in.AddBool(name, element);
+      }
+    }
+  };
 }
 
-RecordingOutput::RecordingOutput(ThrowOn throwOn, const std::string& message)
-    : throwOn_(throwOn), message_(message) {}
-
-void RecordingOutput::MaybeThrow(ThrowOn call) const {
-  if (call == throwOn_) throw HostCtl::Lib::HostCtlException(message_, HostCtl::Lib::KelmMessage());
+void RecordingOutput::Record(const std::string& call, ThrowOn which) {
+  calls_.push_back(call);
+  if (which == throwOn_) {
+    throw HostCtl::Lib::HostCtlException("sink failed", HostCtl::Lib::KelmMessage());
+  }
 }
 
 void RecordingOutput::SetError(const std::string& text) {
-  calls_.push_back("error: " + text);
-  MaybeThrow(ThrowOn::kError);
+  Record("error: " + text, ThrowOn::kError);
   Output::SetError(text);
 }
 
 void RecordingOutput::SetResult(const boost::shared_ptr<MetaObject>& result) {
-  calls_.push_back("result: " + Describe(result));
-  MaybeThrow(ThrowOn::kResult);
+  Record("result: " + Describe(result), ThrowOn::kResult);
   Output::SetResult(result);
 }
 
 void RecordingOutput::Finish() {
-  calls_.push_back("finish");
-  MaybeThrow(ThrowOn::kFinish);
+  Record("finish", ThrowOn::kFinish);
   Output::Finish();
 }
 
-InputPtr MakeInput(const InputFiller& filler) {
-  InputPtr input = Fendle::CallSpec::Input::New();
+Calls RunCommand(Fendle::AutoCli::Command& command, const InputFiller& filler,
+                 RecordingOutput::ThrowOn throwOn) {
+  boost::shared_ptr<Fendle::CallSpec::Input> input = Fendle::CallSpec::Input::New();
   if (filler) filler(*input);
-  return input;
-}
-
-std::vector<std::string> RunCommand(Fendle::AutoCli::Command& command, const InputFiller& filler) {
-  boost::shared_ptr<RecordingOutput> output = RecordingOutput::New();
-  command.Execute(MakeInput(filler), output);
-  return output->Calls();
+  boost::shared_ptr<RecordingOutput> output = RecordingOutput::New(throwOn);
+  command.Execute(input, output);
+  return output->GetCalls();
 }
 
 void SimWorldTest::SetUp() {

@@ -64,28 +64,22 @@ nope                                  non-existent
 }
 
 TEST_F(CliTest, ContainerFailuresEndWithTheCommandsText) {
-  struct Case {
+  const struct {
     std::vector<std::string> arm;  // hyrasim arguments
     std::vector<std::string> args;
     std::string err;
     std::string mounted;
-  };
-  const Case cases[] = {
-      {{"fail", "AddTarnFileSystem", "--after", "1", "--message", "disk full"},
-       {"load"},
-       "Error getting/adding tarn file system 'disk full, skipping\n",
-       "gold silver "},
-      {{"fail", "TarnLib_GetStorageContainer", "--message", "no answer"},
-       {"load"},
-       "Unable to load Tarn datastores: no answer\n",
-       "gold "},
+  } cases[] = {
+      // clang-format off
+      {{"fail", "AddTarnFileSystem", "--after", "1", "--message", "disk full"}, {"load"},
+       "Error getting/adding tarn file system 'disk full, skipping\n", "gold silver "},
+      {{"fail", "TarnLib_GetStorageContainer", "--message", "no answer"}, {"load"},
+       "Unable to load Tarn datastores: no answer\n", "gold "},
       {{"fail", "RemoveTarnFileSystem", "--message", "busy"},
-       {"remove", "-c", "6f1c2f4e-8d3b-4c1a-9e2f-0a1b2c3d4e5f"},
-       "busy\n",
-       "gold "},
+       {"remove", "-c", "6f1c2f4e-8d3b-4c1a-9e2f-0a1b2c3d4e5f"}, "busy\n", "gold "},
+      // clang-format on
   };
-  for (const Case& c : cases) {
-    SCOPED_TRACE(c.err);
+  for (const auto& c : cases) {
     ASSERT_EQ(Sim({"init", "--demo"}).status, 0);
     ASSERT_EQ(Sim(c.arm).status, 0);
     std::vector<std::string> args = c.args;

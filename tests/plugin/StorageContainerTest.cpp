@@ -1,6 +1,7 @@
 // The storagecontainer commands against the simulated host: what they mount
 // and unmount, their exact texts, where a failure stops them, and how the
 // daemon's records are read.
+#include <boost/make_shared.hpp>
 #include <stdexcept>
 
 #include "PluginTestSupport.h"
@@ -14,10 +15,8 @@ namespace PluginTest {
 namespace {
 
 using namespace HalvikCli::TarnNamespace;
-using Fendle::CallSpec::Input;
-using Fendle::MetaObj::MetaList;
 using nlohmann::json;
-typedef std::vector<std::string> Calls;
+using T = RecordingOutput::ThrowOn;
 typedef std::vector<HostCtl::Storage::TarnAccessibilityType> States;
 
 constexpr char kGoldId[] = "6f1c2f4e-8d3b-4c1a-9e2f-0a1b2c3d4e5f";
@@ -70,40 +69,34 @@ class StorageContainerTest : public SimWorldTest {
 };
 
 TEST_F(StorageContainerTest, LoadMountsWhatIsNotMountedAndStopsAtTheFirstFailure) {
-  struct Case {
-    const char* name;
+  const struct {
     json world;
     Arming arming;
     Calls calls;  // a result as the names of its rows
     std::string mountedAfter;
-  };
-  // clang-format off
-  const Case cases[] = {
-      {"all mounted", Containers(2, {1, 2}), {"AddTarnFileSystem", 0, false}, {"", "finish"},
+  } cases[] = {
+      // clang-format off
+      {Containers(2, {1, 2}), {"AddTarnFileSystem", 0, false}, {"", "finish"}, "c1 c2 "},
+      {Containers(5, {2}), {}, {"c1 c3 c4 c5 ", "finish"}, "c2 c1 c3 c4 c5 "},
+      // The listing is asked for even with nothing exported.
+      {Containers(0, {}), {"GetTarnFileSystems", 0, false}, {kLoadError + "boom, skipping"}, ""},
+      {Containers(5, {}), {"AddTarnFileSystem", 2, false}, {kLoadError + "boom, skipping"},
        "c1 c2 "},
-      {"second mounted", Containers(5, {2}), {}, {"c1 c3 c4 c5 ", "finish"}, "c2 c1 c3 c4 c5 "},
-      {"listing asked with nothing exported", Containers(0, {}), {"GetTarnFileSystems", 0, false},
-       {kLoadError + "boom, skipping"}, ""},
-      {"third mount refused", Containers(5, {}), {"AddTarnFileSystem", 2, false},
-       {kLoadError + "boom, skipping"}, "c1 c2 "},
-      {"second mount yields nothing", Containers(3, {}), {"AddTarnFileSystem", 1, true},
+      {Containers(3, {}), {"AddTarnFileSystem", 1, true},
        {kLoadError + "Unable to mount c2, skipping"}, "c1 "},
       // The row names the container as the host reports the new mount.
-      {"host names a new mount blank", Containers(2, {}), {"GetContainerName", 1, true},
-       {"c1  ", "finish"}, "c1 c2 "},
-      {"daemon answers no result", Containers(2, {}), {"TarnLib_GetStorageContainer", 0, true},
-       {"", "finish"}, ""},
-      {"daemon fails", Containers(2, {}), {"TarnLib_GetStorageContainer", 0, false},
+      {Containers(2, {}), {"GetContainerName", 1, true}, {"c1  ", "finish"}, "c1 c2 "},
+      {Containers(2, {}), {"TarnLib_GetStorageContainer", 0, true}, {"", "finish"}, ""},
+      {Containers(2, {}), {"TarnLib_GetStorageContainer", 0, false},
        {"error: Unable to load Tarn datastores: boom"}, ""},
+      // clang-format on
   };
-  // clang-format on
-  for (const Case& c : cases) {
-    SCOPED_TRACE(c.name);
+  for (const auto& c : cases) {
     Prepare(c.world, c.arming);
     boost::shared_ptr<RecordingOutput> output = RecordingOutput::New();
-    StorageContainerLoad::New()->Execute(MakeInput(nullptr), output);
-    Calls calls = output->Calls();
-    if (auto rows = boost::dynamic_pointer_cast<MetaList>(output->GetResult())) {
+    StorageContainerLoad::New()->Execute(Fendle::CallSpec::Input::New(), output);
+    Calls calls = output->GetCalls();
+    if (auto rows = boost::dynamic_pointer_cast<Fendle::MetaObj::MetaList>(output->GetResult())) {
       calls[0].clear();
       for (const auto& row : rows->GetElements()) {
         const std::string text = Describe(row);  // StorageContainer{StorageContainer Name="..."
@@ -117,43 +110,33 @@ TEST_F(StorageContainerTest, LoadMountsWhatIsNotMountedAndStopsAtTheFirstFailure
 }
 
 TEST_F(StorageContainerTest, LoadReportsAFailingSinkAndLetsOtherExceptionsPass) {
-  boost::shared_ptr<RecordingOutput> output =
-      RecordingOutput::New(RecordingOutput::ThrowOn::kResult);
-  StorageContainerLoad::New()->Execute(MakeInput(nullptr), output);
-  ASSERT_EQ(output->Calls().size(), 2u);
-  EXPECT_EQ(output->Calls()[1], kLoadError + "sink failed, skipping");
+  const Calls calls = RunCommand(*StorageContainerLoad::New(), nullptr, T::kResult);
+  ASSERT_EQ(calls.size(), 2u);
+  EXPECT_EQ(calls[1], kLoadError + "sink failed, skipping");
   LoadScenario(Containers(1, {}));
-  EXPECT_THROW(StorageContainerLoad::New()->Execute(
-                   MakeInput(nullptr), boost::shared_ptr<RefusingOutput>(new RefusingOutput())),
+  EXPECT_THROW(StorageContainerLoad::New()->Execute(Fendle::CallSpec::Input::New(),
+                                                    boost::make_shared<RefusingOutput>()),
                std::runtime_error);
   EXPECT_EQ(MountedNames(), "c1 ");
 }
 
+// Well-formed endpoints are checked end to end; these are the parts the
+// daemon may leave out.
 TEST(StorageContainerRecords, DescribeEndpointsAndReadMissingPartsAsEmpty) {
-  char a[] = "a", b[] = "b", uid[] = "u1", m1[] = "m1", ip[] = "ip";
+  char a[] = "a", b[] = "b", uid[] = "u1", m1[] = "m1";
   char* addresses[] = {a, nullptr, b};
-  struct Case {
-    ProtocolEndpointAddress address;
-    bool hasAddress;
-    int32_t addressCount;
-    std::string tail;  // what follows the isConfigured digit
+  ProtocolEndpointAddress nfs4{2, m1, nullptr}, bare4{2, nullptr, nullptr}, other{3, m1, m1};
+  const std::pair<ProtocolEndpointAddress*, std::string> cases[] = {
+      {&nfs4, ", type: NFS4x, ipAddress(es): a,,b, serverMount: m1)"},
+      {&bare4, ", type: NFS4x, ipAddress(es): , serverMount: )"},
+      {&other, ""},
+      {nullptr, ""},
   };
-  // clang-format off
-  const Case cases[] = {
-      {{0, m1, nullptr}, true, 0, ", type: SCSI, lunID: m1)"},
-      {{1, ip, m1}, true, 0, ", type: NFS, ipAddress: ip, serverMount: m1)"},
-      {{2, m1, nullptr}, true, 3, ", type: NFS4x, ipAddress(es): a,,b, serverMount: m1)"},
-      {{2, nullptr, nullptr}, true, 0, ", type: NFS4x, ipAddress(es): , serverMount: )"},
-      {{3, m1, m1}, true, 0, ""},
-      {{}, false, 0, ""},
-  };
-  // clang-format on
-  for (Case entry : cases) {
-    SCOPED_TRACE(entry.tail);
-    ProtocolEndpointRecord endpoint{uid, 0, 0, addresses, entry.addressCount, 0, 0, nullptr, 7, 0};
-    if (entry.hasAddress) endpoint.address = &entry.address;
+  for (const auto& c : cases) {
+    const int32_t count = c.first == &nfs4 ? 3 : 0;
+    ProtocolEndpointRecord endpoint{uid, 0, 0, addresses, count, 0, 0, c.first, 7, 0};
     EXPECT_EQ(DescribeProtocolEndpoint(2, endpoint),
-              "PE #2 (localUID: u1, isAccessible: 1, isConfigured: 0" + entry.tail);
+              "PE #2 (localUID: u1, isAccessible: 1, isConfigured: 0" + c.second);
   }
   // Missing arrays and endpoints are skipped; the others keep their index.
   ProtocolEndpointRecord bare{nullptr, 0, 0, nullptr, 0, 0, 0, nullptr, 0, 1};
@@ -170,66 +153,45 @@ TEST(StorageContainerRecords, DescribeEndpointsAndReadMissingPartsAsEmpty) {
 
 TEST_F(StorageContainerTest, AddMountsAsGivenAndAnswersWhetherTheHostMounted) {
   const json mount = {{"name", "silver"}, {"id", "ABC"}, {"arrays", {"b", "a"}}};
-  struct Case {
-    const char* name;
+  const struct {
     Arming arming;
-    RecordingOutput::ThrowOn sinkThrows;
+    T sinkThrows;
     Calls calls;
     json mounted;  // the new mount, or null
+  } cases[] = {
+      {{}, T::kNothing, {"result: true", "finish"}, mount},
+      {{"AddTarnFileSystem", 0, true}, T::kNothing, {"result: false", "finish"}, nullptr},
+      {{"AddTarnFileSystem", 0, false}, T::kNothing, {"error: boom"}, nullptr},
+      {{}, T::kResult, {"result: true", "error: sink failed"}, mount},
   };
-  // clang-format off
-  const Case cases[] = {
-      {"mounted", {}, RecordingOutput::ThrowOn::kNothing, {"result: true", "finish"}, mount},
-      {"nothing mounted", {"AddTarnFileSystem", 0, true}, RecordingOutput::ThrowOn::kNothing,
-       {"result: false", "finish"}, nullptr},
-      {"host refuses", {"AddTarnFileSystem", 0, false}, RecordingOutput::ThrowOn::kNothing,
-       {"error: boom"}, nullptr},
-      {"sink refuses", {}, RecordingOutput::ThrowOn::kResult,
-       {"result: true", "error: sink failed"}, mount},
-  };
-  // clang-format on
-  for (const Case& c : cases) {
-    SCOPED_TRACE(c.name);
+  const json args = {{"container-name", "silver"}, {"container-id", "ABC"}, {"array", {"b", "a"}}};
+  for (const auto& c : cases) {
     Prepare(Containers(0, {}), c.arming);
-    boost::shared_ptr<RecordingOutput> output = RecordingOutput::New(c.sinkThrows);
-    StorageContainerAdd::New()->Execute(MakeInput([](Input& in) {
-                                          in.SetString("container-name", "silver");
-                                          in.SetString("container-id", "ABC");
-                                          in.AddString("array", "b");
-                                          in.AddString("array", "a");
-                                        }),
-                                        output);
-    EXPECT_EQ(output->Calls(), c.calls);
+    EXPECT_EQ(RunCommand(*StorageContainerAdd::New(), Args(args), c.sinkThrows), c.calls);
     EXPECT_EQ(World()["host"]["mounted"][0], c.mounted);
   }
 }
 
 TEST_F(StorageContainerTest, RemoveUnmountsByTheNormalForm) {
   const json demo = World();
-  struct Case {
+  const std::string bad = "error: Bad CID : ";
+  const struct {
     std::string id;
     const char* armed;
     Calls calls;
     size_t mountsLeft;
-  };
-  // clang-format off
-  const Case cases[] = {
+  } cases[] = {
       {"6F1C2F4E-8D3B-4C1A-9E2F-0A1B2C3D4E5F", nullptr, {"result: true", "finish"}, 0},
-      {"9B8A7C6D-5E4F-4A3B-8C2D-1E0F9A8B7C6D", nullptr,
+      {"9B8A7C6D-5E4F-4A3B-8C2D-1E0F9A8B7C6D",
+       nullptr,
        {"error: No container file system with id 9b8a7c6d-5e4f-4a3b-8c2d-1e0f9a8b7c6d is mounted"},
        1},
-      {"q", "RemoveTarnFileSystem", {"error: Bad CID : q"}, 1},
-      {kGoldId, "TarnLib_NormalizeContainerIdString", {std::string("error: Bad CID : ") + kGoldId},
-       1},
-      {kGoldId, "RemoveTarnFileSystem", {"error: boom"}, 1},
+      {"q", "RemoveTarnFileSystem", {bad + "q"}, 1},
+      {kGoldId, "TarnLib_NormalizeContainerIdString", {bad + kGoldId}, 1},
   };
-  // clang-format on
-  for (const Case& c : cases) {
-    SCOPED_TRACE(c.id + (c.armed ? c.armed : ""));
+  for (const auto& c : cases) {
     Prepare(demo, {c.armed, 0, false});
-    EXPECT_EQ(RunCommand(*StorageContainerRemove::New(),
-                         [&](Input& in) { in.SetString("container-id", c.id); }),
-              c.calls);
+    EXPECT_EQ(RunCommand(*StorageContainerRemove::New(), Args({{"container-id", c.id}})), c.calls);
     EXPECT_EQ(World()["host"]["mounted"].size(), c.mountsLeft);
   }
 }
@@ -256,38 +218,32 @@ TEST_F(StorageContainerTest, CheckTarnsListsEachTarnWithItsState) {
   };
   auto rows = [&](const Calls& r) { return Calls{"result: " + table(r), "finish"}; };
   const std::string gold = "/hyra/volumes/gold";
-  struct Case {
-    const char* name;
+  const struct {
     std::string path;
     Calls tarns;
     Arming arming;
     Calls calls;
-  };
-  // clang-format off
-  const Case cases[] = {
-      {"named, every state, one twice", gold, {"t0", "t1", "t2", "t3", "t4", "t5", "t2", "x"}, {},
+  } cases[] = {
+      // clang-format off
+      // Named tarns in every state, one twice, one unknown.
+      {gold, {"t0", "t1", "t2", "t3", "t4", "t5", "t2", "x"}, {},
        rows({"t0=accessible", "t1=non-existent", "t2=inaccessible", "t3=unconfirmed", "t4=", "t5=",
              "t2=inaccessible", "x=non-existent"})},
-      {"config-tarns in order", gold, {}, {}, rows({"t1=non-existent", "t3=unconfirmed", "t5="})},
-      {"no config-tarn", "/hyra/volumes/silver", {}, {}, rows({})},
-      {"query fails", gold, {}, {"TarnLib_QueryAllConfigTarns", 0, false}, rows({})},
-      {"query answers nothing", gold, {}, {"TarnLib_QueryAllConfigTarns", 0, true}, rows({})},
-      {"fewer states than ids", gold, {"t0"}, {"CheckTarnAccessibility", 0, true}, rows({})},
-      {"not mounted", "/hyra/volumes/bronze", {"t0"}, {}, {"error: Bad datastore path"}},
-      {"id unreadable", gold, {}, {"GetContainerIdText", 0, false}, {"error: boom"}},
-      {"check fails", gold, {"t0"}, {"CheckTarnAccessibility", 0, false}, {"error: boom"}},
+      // No tarn named: the container's config-tarns in order.
+      {gold, {}, {}, rows({"t1=non-existent", "t3=unconfirmed", "t5="})},
+      {"/hyra/volumes/silver", {}, {}, rows({})},
+      {gold, {}, {"TarnLib_QueryAllConfigTarns", 0, false}, rows({})},
+      {gold, {}, {"TarnLib_QueryAllConfigTarns", 0, true}, rows({})},
+      {gold, {"t0"}, {"CheckTarnAccessibility", 0, true}, rows({})},
+      {"/hyra/volumes/bronze", {"t0"}, {}, {"error: Bad datastore path"}},
+      {gold, {}, {"GetContainerIdText", 0, false}, {"error: boom"}},
+      {gold, {"t0"}, {"CheckTarnAccessibility", 0, false}, {"error: boom"}},
+      // clang-format on
   };
-  // clang-format on
-  boost::shared_ptr<StorageContainerCheckTarns> check = StorageContainerCheckTarns::New();
-  for (const Case& c : cases) {
-    SCOPED_TRACE(c.name);
+  const auto check = StorageContainerCheckTarns::New();
+  for (const auto& c : cases) {
     Prepare(world, c.arming);
-    EXPECT_EQ(RunCommand(*check,
-                         [&](Input& in) {
-                           in.SetString("path", c.path);
-                           for (const auto& t : c.tarns) in.AddString("tarn", t);
-                         }),
-              c.calls);
+    EXPECT_EQ(RunCommand(*check, Args({{"path", c.path}, {"tarn", c.tarns}})), c.calls);
   }
   // Ids and states pair by position, never past the end of either list.
   EXPECT_EQ(Describe(check->GetAccessibilityList({"a", "b"},

@@ -51,9 +51,6 @@ TEST_F(VolumeTest, CommandsAnswerOrReportTheirFirstFailure) {
        "error: Failed to get the storage profile for Tarn."},
       {get, Volume(kGold, kTarn), "TarnLib_UnsharedChunksTarn", true,
        "error: Failed to get block size for Tarn."},
-      {list, Volume("2c3d4e5f-6a7b-4c8d-9e0f-a1b2c3d4e5f6", "7f8e9d0c-1b2a-4c3d-8e4f-5a6b7c8d9e0f"),
-       nullptr, false, ">TarnMetaData{key=\"owner\",value=\"qa\"},TarnMetaData{key=\"backup\","
-       "value=\"nightly\"},TarnMetaData{key=\"tier\",value=\"3\"}]"},
       {list, Volume(kGold, kBare), nullptr, false, "result: [<TarnMetaData{key=\"\",value=\"\"}>]"},
       {list, Volume(kGold, kTarn), "TarnLib_GetTarnMetadata", true,
        "error: Failed to get the metadata for Tarn."},
@@ -63,10 +60,10 @@ TEST_F(VolumeTest, CommandsAnswerOrReportTheirFirstFailure) {
     SCOPED_TRACE(c.first);
     if (c.armed) Arm(c.armed, "no", 0, c.null);
     TarnLibSim_ResetCounters();
-    const std::vector<std::string> calls = RunCommand(*c.command, c.input);
+    const Calls calls = RunCommand(*c.command, c.input);
     // An error ends the command alone; a result is followed by Finish.
     if (c.first.rfind("error: ", 0) == 0) {
-      EXPECT_EQ(calls, std::vector<std::string>{c.first});
+      EXPECT_EQ(calls, Calls{c.first});
     } else {
       ASSERT_EQ(calls.size(), 2u);
       EXPECT_NE(calls[0].find(c.first), std::string::npos) << calls[0];
@@ -77,8 +74,7 @@ TEST_F(VolumeTest, CommandsAnswerOrReportTheirFirstFailure) {
 
   // A sink that refuses the rows leaves the record and the library released.
   TarnLibSim_ResetCounters();
-  EXPECT_THROW(list->Execute(MakeInput(Volume(kGold, kTarn)),
-                             RecordingOutput::New(RecordingOutput::ThrowOn::kResult)),
+  EXPECT_THROW(RunCommand(*list, Volume(kGold, kTarn), RecordingOutput::ThrowOn::kResult),
                HostCtl::Lib::HostCtlException);
   EXPECT_EQ(TarnLibSim_Openings(), 0);
 }
