@@ -91,44 +91,50 @@ void VirtualVolumeGet::ExecuteInternal(const boost::shared_ptr<Fendle::CallSpec:
   info->SetField(kTarnUuid, volume.uuid);
   info->SetField(kContainerIdField, volume.containerId);
 
-  TarnSpaceStatsInfo* statsRecord = nullptr;
-  TarnLib_Status status = TarnLib_SpaceStatsForTarn(volume.containerId, uuid, &statsRecord);
-  const TarnSpaceStatsOwner stats(statsRecord);
-  if (status != TARNLIB_OK || !stats) {
-    EndWithError(output, kSpaceStatsFailed);
-    return;
+  // Each record is given back as soon as it has been read, before the next question.
+  {
+    TarnSpaceStatsInfo* statsRecord = nullptr;
+    const TarnLib_Status status = TarnLib_SpaceStatsForTarn(volume.containerId, uuid, &statsRecord);
+    const TarnSpaceStatsOwner stats(statsRecord);
+    if (status != TARNLIB_OK || !stats) {
+      EndWithError(output, kSpaceStatsFailed);
+      return;
+    }
+    info->SetField(kLogicalSize, stats->logicalSizeMB);
+    info->SetField(kCommittedSize, stats->committedSizeMB);
+    if (stats->unsharedSizeValid) {
+      info->SetField(kUnsharedSize, stats->unsharedSizeMB);
+      info->SetField(kUnsharedSizeValid, MetaBool::New(true));
+    } else {
+      info->SetField(kUnsharedSizeValid, MetaBool::New(false));
+    }
   }
-  info->SetField(kLogicalSize, stats->logicalSizeMB);
-  info->SetField(kCommittedSize, stats->committedSizeMB);
-  if (stats->unsharedSizeValid) {
-    info->SetField(kUnsharedSize, stats->unsharedSizeMB);
-    info->SetField(kUnsharedSizeValid, MetaBool::New(true));
-  } else {
-    info->SetField(kUnsharedSizeValid, MetaBool::New(false));
+  {
+    TarnInfo* infoRecord = nullptr;
+    const TarnLib_Status status = TarnLib_GetTarnInfo(volume.containerId, uuid, &infoRecord);
+    const TarnInfoOwner tarnInfo(infoRecord);
+    if (status != TARNLIB_OK || !tarnInfo) {
+      EndWithError(output, kStorageProfileFailed);
+      return;
+    }
+    if (tarnInfo->storageProfile != nullptr) {
+      info->SetField(kStorageProfile, tarnInfo->storageProfile);
+    }
   }
-
-  TarnInfo* infoRecord = nullptr;
-  status = TarnLib_GetTarnInfo(volume.containerId, uuid, &infoRecord);
-  const TarnInfoOwner tarnInfo(infoRecord);
-  if (status != TARNLIB_OK || !tarnInfo) {
-    EndWithError(output, kStorageProfileFailed);
-    return;
+  {
+    void* chunksBlock = nullptr;
+    const TarnLib_Status status =
+        TarnLib_UnsharedChunksTarn(volume.containerId, uuid, 0, 0, 0, 0, 0, &chunksBlock);
+    const UnsharedChunksOwner chunks(chunksBlock);
+    if (status != TARNLIB_OK || !chunks) {
+      EndWithError(output, kBlockSizeFailed);
+      return;
+    }
+    // The block starts with the block size.
+    int64_t blockSize = 0;
+    std::memcpy(&blockSize, chunks.get(), sizeof blockSize);
+    info->SetField(kBlockSize, blockSize);
   }
-  if (tarnInfo->storageProfile != nullptr) {
-    info->SetField(kStorageProfile, tarnInfo->storageProfile);
-  }
-
-  void* chunksBlock = nullptr;
-  status = TarnLib_UnsharedChunksTarn(volume.containerId, uuid, 0, 0, 0, 0, 0, &chunksBlock);
-  const UnsharedChunksOwner chunks(chunksBlock);
-  if (status != TARNLIB_OK || !chunks) {
-    EndWithError(output, kBlockSizeFailed);
-    return;
-  }
-  // The block starts with the block size.
-  int64_t blockSize = 0;
-  std::memcpy(&blockSize, chunks.get(), sizeof blockSize);
-  info->SetField(kBlockSize, blockSize);
 
   EndWithResult(output, info);
 }
