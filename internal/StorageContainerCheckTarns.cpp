@@ -3,6 +3,7 @@
 #include <algorithm>
 #include <cstdint>
 #include <memory>
+#include <string>
 
 #include "CommandEndings.h"
 #include "CommandSpecs.h"
@@ -32,6 +33,7 @@ constexpr char kRowStructure[] = "TarnsAreAccessible";
 constexpr char kTarnIdField[] = "TarnId";
 constexpr char kStatusField[] = "Status";
 constexpr char kBadPath[] = "Bad datastore path";
+constexpr char kQueryFailedPrefix[] = "Unable to list the config-tarns of container ";
 // Asks the daemon for every config-tarn at once.
 constexpr int32_t kAllEntries = 2147483647;
 
@@ -40,20 +42,24 @@ struct FreeQueryResult {
 };
 typedef std::unique_ptr<QueryResult, FreeQueryResult> QueryResultOwner;
 
-// The ids of the container's config-tarns in the daemon's order; none when
-// the query fails, which is not reported.
-std::vector<std::string> QueryConfigTarnIds(const std::string& containerId) {
+// Appends the ids of the container's config-tarns to ids, in the daemon's
+// order, and answers the query's status. The result is given back whether the
+// query succeeded or not.
+TarnLib_Status QueryConfigTarnIds(const std::string& containerId, std::vector<std::string>& ids) {
   QueryResult* handedOut = nullptr;
   const TarnLib_Status status =
       TarnLib_QueryAllConfigTarns(containerId.c_str(), kAllEntries, 0, &handedOut, 0);
-  // Given back whether the query succeeded or not.
   const QueryResultOwner result(handedOut);
-  std::vector<std::string> ids;
-  if (status != TARNLIB_OK || result == nullptr || result->entries == nullptr) return ids;
+  if (status != TARNLIB_OK || result == nullptr || result->entries == nullptr) return status;
   for (int32_t i = 0; i < result->entryCount; ++i) {
     if (const ConfigTarnEntry* entry = result->entries[i]) ids.push_back(TextOf(entry->tarnId));
   }
-  return ids;
+  return status;
+}
+
+// "1 state", "2 states".
+std::string Counted(size_t count, const char* singular, const char* plural) {
+  return std::to_string(count) + " " + (count == 1 ? singular : plural);
 }
 
 // The status word of a state, or null for a state without one.
@@ -130,8 +136,25 @@ void StorageContainerCheckTarns::ExecuteInternal(
       EndWithError(output, kBadPath);
       return;
     }
-    if (tarnIds.empty()) tarnIds = QueryConfigTarnIds(container->GetContainerIdText());
+    if (tarnIds.empty()) {
+      // A failed query is not an empty container: say so rather than answer no rows.
+      const std::string containerId = container->GetContainerIdText();
+      const TarnLib_Status status = QueryConfigTarnIds(containerId, tarnIds);
+      if (status != TARNLIB_OK) {
+        EndWithError(output,
+                     kQueryFailedPrefix + containerId + ": " + TextOf(TarnLib_Err2String(status)));
+        return;
+      }
+    }
     const std::vector<TarnAccessibilityType> states = container->CheckTarnAccessibility(tarnIds);
+    // Rows pair ids and states by position; a short or long answer would drop
+    // tarns or invent them.
+    if (states.size() != tarnIds.size()) {
+      EndWithError(output, "The host answered " +
+                               Counted(states.size(), "accessibility state", "accessibility states") +
+                               " for " + Counted(tarnIds.size(), "tarn", "tarns"));
+      return;
+    }
     EndWithResult(output, GetAccessibilityList(tarnIds, states));
   } catch (const HostCtl::Lib::HostCtlException& e) {
     EndWithError(output, e.GetMessage(false));

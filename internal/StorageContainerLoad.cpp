@@ -46,7 +46,7 @@ constexpr char kPeInfoField[] = "PEInfo";
 constexpr char kLoadFailedPrefix[] = "Unable to load Tarn datastores: ";
 constexpr char kMountFailedPrefix[] = "Error getting/adding tarn file system '";
 constexpr char kMountFailedSuffix[] = ", skipping";
-constexpr char kNothingMountedPrefix[] = "Unable to mount ";
+constexpr char kNothingMountedPrefix[] = "no file system was returned for container ";
 
 struct FreeStorageContainerResult {
   void operator()(StorageContainerResult* result) const {
@@ -221,7 +221,8 @@ void StorageContainerLoad::ExecuteInternal(
 
       const std::unique_ptr<HostCtl::Storage::TarnFileSystem> system(
           storageInfo.AddTarnFileSystem(name, id, arrayIds, true));
-      // A mount that yields nothing ends the load as a refused mount does.
+      // A mount that yields nothing ends the load as a refused mount does,
+      // saying that the host answered nothing rather than that it refused.
       if (system == nullptr) {
         throw HostCtl::Lib::HostCtlException(kNothingMountedPrefix + name,
                                              HostCtl::Lib::KelmMessage());

@@ -83,7 +83,7 @@ TEST_F(StorageContainerTest, LoadMountsWhatIsNotMountedAndStopsAtTheFirstFailure
       {Containers(5, {}), {"AddTarnFileSystem", 2, false}, {kLoadError + "boom, skipping"},
        "c1 c2 "},
       {Containers(3, {}), {"AddTarnFileSystem", 1, true},
-       {kLoadError + "Unable to mount c2, skipping"}, "c1 "},
+       {kLoadError + "no file system was returned for container c2, skipping"}, "c1 "},
       // The row names the container as the host reports the new mount.
       {Containers(2, {}), {"GetContainerName", 1, true}, {"c1  ", "finish"}, "c1 c2 "},
       {Containers(2, {}), {"TarnLib_GetStorageContainer", 0, true}, {"", "finish"}, ""},
@@ -232,9 +232,11 @@ TEST_F(StorageContainerTest, CheckTarnsListsEachTarnWithItsState) {
       // No tarn named: the container's config-tarns in order.
       {gold, {}, {}, rows({"t1=non-existent", "t3=unconfirmed", "t5="})},
       {"/hyra/volumes/silver", {}, {}, rows({})},
-      {gold, {}, {"TarnLib_QueryAllConfigTarns", 0, false}, rows({})},
+      {gold, {}, {"TarnLib_QueryAllConfigTarns", 0, false},
+       {"error: Unable to list the config-tarns of container " + std::string(kGoldId) + ": boom"}},
       {gold, {}, {"TarnLib_QueryAllConfigTarns", 0, true}, rows({})},
-      {gold, {"t0"}, {"CheckTarnAccessibility", 0, true}, rows({})},
+      {gold, {"t0"}, {"CheckTarnAccessibility", 0, true},
+       {"error: The host answered 0 accessibility states for 1 tarn"}},
       {"/hyra/volumes/bronze", {"t0"}, {}, {"error: Bad datastore path"}},
       {gold, {}, {"GetContainerIdText", 0, false}, {"error: boom"}},
       {gold, {"t0"}, {"CheckTarnAccessibility", 0, false}, {"error: boom"}},
