@@ -1,6 +1,9 @@
 // The config-tarn commands and kirocontext set end to end.
+#include <sys/stat.h>
+
 #include <fstream>
 #include <nlohmann/json.hpp>
+#include <string>
 
 #include "CliSupport.h"
 
@@ -35,6 +38,32 @@ TEST_F(CliTest, ConfigTarnAndKiroContextStoreWhatTheySentOrReportWhy) {
   EXPECT_EQ(Tarn({"configtarn", "umount", "-c", kGold}),
             (Outcome{1, "", "Either StorageContainer Name or UUID is required\n"}));
   EXPECT_EQ(World(), world);
+}
+
+TEST_F(CliTest, PolicyFileIsARegularFileWithAFirstLineOfAtMostOneMebibyte) {
+  constexpr size_t kMiB = 1024 * 1024;
+  const std::string fifo = directory_ + "/fifo";
+  ASSERT_EQ(mkfifo(fifo.c_str(), 0600), 0);
+  const std::string link = directory_ + "/link-to-fifo";
+  ASSERT_EQ(symlink(fifo.c_str(), link.c_str()), 0);
+  const std::string atLimit = directory_ + "/at-limit", overLimit = directory_ + "/over-limit";
+  std::ofstream(atLimit) << std::string(kMiB, 'a') << "\nrest\n";
+  std::ofstream(overLimit) << std::string(kMiB + 1, 'a');
+
+  const json demo = World();
+  // Neither blocks nor reads without end: both are refused before anything is read.
+  for (const std::string& path : {fifo, link, std::string("/dev/zero"), overLimit}) {
+    SCOPED_TRACE(path);
+    EXPECT_EQ(Tarn({"configtarn", "add", "-n", "cfg", "-c", kGold, "-f", path}),
+              (Outcome{1, "", "Unable to read policy file " + path + "\n"}));
+    EXPECT_EQ(World(), demo);
+  }
+  EXPECT_EQ(Tarn({"configtarn", "add", "-n", "cfg", "-c", kGold, "-f", atLimit}),
+            (Outcome{0, "true\n", ""}));
+  const json world = World();
+  const json& created = world["containers"][0]["tarns"].back()["configTarn"];
+  EXPECT_EQ(created["name"], "cfg");
+  EXPECT_EQ(created["policy"], std::string(kMiB, 'a'));
 }
 
 }  // namespace
