@@ -120,9 +120,10 @@ void DaemonCommand::ExecuteInternal(const boost::shared_ptr<Fendle::CallSpec::In
   std::vector<std::string> containers;
 
   // The debug settings are collected first, whichever action follows.
+  // The period is checked against the daemon's 32 bits only where it is sent.
   std::optional<int32_t> logLevel;
   std::optional<int32_t> dumpObjects;
-  std::optional<int32_t> unbindPeriod;
+  std::optional<int64_t> unbindPeriod;
   if (input->IsSet(kLogLevel)) {
     logLevel = GetLogLevelInt(input->GetString(kLogLevel));
   }
@@ -132,13 +133,7 @@ void DaemonCommand::ExecuteInternal(const boost::shared_ptr<Fendle::CallSpec::In
   if (input->GetFlag(kUnbindNow)) {
     unbindPeriod = kUnbindNowPeriod;
   } else if (input->IsSet(kUnbindPeriod)) {
-    int32_t period;
-    std::string error;
-    if (!ReadInt32(*input, kUnbindPeriod, period, error)) {
-      EndWithError(output, error);
-      return;
-    }
-    unbindPeriod = period;
+    unbindPeriod = input->GetInt(kUnbindPeriod);
   }
 
   if (input->IsSet(kStartPeApd)) {
@@ -166,9 +161,20 @@ void DaemonCommand::ExecuteInternal(const boost::shared_ptr<Fendle::CallSpec::In
     return;
   }
   if (logLevel || dumpObjects || unbindPeriod) {
+    // A period the daemon cannot hold is refused rather than cut to another number.
+    std::optional<int32_t> period;
+    if (unbindPeriod) {
+      int32_t narrowed;
+      std::string error;
+      if (!NarrowToInt32(kUnbindPeriod, *unbindPeriod, narrowed, error)) {
+        EndWithError(output, error);
+        return;
+      }
+      period = narrowed;
+    }
     EndWithDaemonStatus(
         output,
-        TarnLib_DebugCommand(SettingOf(logLevel), SettingOf(dumpObjects), SettingOf(unbindPeriod)),
+        TarnLib_DebugCommand(SettingOf(logLevel), SettingOf(dumpObjects), SettingOf(period)),
         kDebugFailedPrefix);
     return;
   }

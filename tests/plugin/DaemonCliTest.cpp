@@ -35,5 +35,27 @@ TEST_F(CliTest, RefusedDaemonSettingsChangeNothing) {
   EXPECT_EQ(World()["daemon"], daemon);
 }
 
+TEST_F(CliTest, UnbindPeriodIsCheckedOnlyWhereItIsSent) {
+  // The endpoint and space-efficiency actions never send the period, so any
+  // value lets them run.
+  EXPECT_EQ(Tarn({"daemon", "set", "--start-pe-apd", "pe-a1", "--unbind-period", "4294967296"}),
+            (Outcome{1, "", "Notify PE APD command returned containers: gold, .\n"}));
+  EXPECT_EQ(World()["arrays"][0]["protocolEndpoints"][0]["accessible"], false);
+  EXPECT_EQ(Tarn({"daemon", "set", "--end-pe-apd", "pe-a1", "-t", "-4294967296"}),
+            (Outcome{1, "", "Notify PE APD command returned containers: gold, .\n"}));
+  EXPECT_EQ(World()["arrays"][0]["protocolEndpoints"][0]["accessible"], true);
+  EXPECT_EQ(Tarn({"daemon", "set", "--disable-spm-space-efficiency-cmds", "true", "-t",
+                  "4294967296"}),
+            (Outcome{0, "true\n", ""}));
+  EXPECT_EQ(World()["daemon"]["spaceEfficiencyManipulation"], false);
+  // Where it is sent, a period the daemon cannot hold is still refused.
+  const json world = World();
+  EXPECT_EQ(Tarn({"daemon", "set", "-d", "-t", "4294967296"}),
+            (Outcome{1, "",
+                     "Invalid value for parameter unbind-period: 4294967296 is outside the range "
+                     "-2147483648 to 2147483647\n"}));
+  EXPECT_EQ(World(), world);
+}
+
 }  // namespace
 }  // namespace PluginCliTest
