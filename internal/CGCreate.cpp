@@ -3,12 +3,12 @@
 #include <string>
 #include <vector>
 
-#include "CommandEndings.h"
-#include "CommandSpecs.h"
-#include "GroupListing.h"
-#include "ParameterNames.h"
 #include "TarnLib/TarnLib.h"
-#include "TarnLibBracket.h"
+#include "support/CommandEndings.h"
+#include "support/CommandSpecs.h"
+#include "support/GroupListing.h"
+#include "support/ParameterNames.h"
+#include "support/TarnLibBracket.h"
 
 namespace HalvikCli {
 namespace TarnNamespace {
@@ -20,6 +20,10 @@ namespace {
 constexpr char kDescription[] = "Create a Consistency Group.";
 constexpr char kSource[] = "internal/CGCreate";
 constexpr int kInitLine = 47;
+constexpr char kRowStructure[] = "CGCreate";
+// The hint shows the fields in another order than the structure holds them.
+const FieldNames kRowFields = {
+    "Name", "Description", "Id", "DestinationArrayId", "FailoverArrayId", "SourceArrayId", "State"};
 
 }  // namespace
 
@@ -28,9 +32,7 @@ boost::shared_ptr<CGCreate> CGCreate::New() { return boost::shared_ptr<CGCreate>
 CGCreate::CGCreate() {
   SetDescription(kDescription);
   SetDefaultOutputFormatter(kTableFormatter);
-  SetDefaultOutputParameter(
-      "fields:CGCreate",
-      "Name,Description,Id,DestinationArrayId,FailoverArrayId,SourceArrayId,State");
+  SetDefaultOutputParameter(FieldsHintKey(kRowStructure), JoinFieldNames(kRowFields));
   SetMetaDataField(kTypeField, kOperationKind);
   OpenTarnLib(kSource, kInitLine);
 }
@@ -52,8 +54,7 @@ boost::shared_ptr<Fendle::CallSpec::OutputSpec> CGCreate::GetOutputSpecInternal(
 }
 
 boost::shared_ptr<Fendle::MetaObj::MetaStruct> CGCreate::GetOutputStructure() {
-  return NewTextStruct("CGCreate", {"Name", "Description", "Id", "DestinationArrayId",
-                                    "FailoverArrayId", "SourceArrayId", "State"});
+  return NewTextStruct(kRowStructure, kRowFields);
 }
 
 void CGCreate::ExecuteInternal(const boost::shared_ptr<Fendle::CallSpec::Input>& input,
@@ -68,11 +69,8 @@ void CGCreate::ExecuteInternal(const boost::shared_ptr<Fendle::CallSpec::Input>&
     EndWithError(output, kFailedToInitializeTarnLib);
     return;
   }
-  const boost::shared_ptr<Fendle::MetaObj::MetaStruct> row = GetOutputStructure();
-  std::vector<std::string> fields;
-  for (const auto& field : row->GetFields()) fields.push_back(field.first);
-  for (const std::string& field : fields) row->SetField(field, std::string());
-  EndWithResult(output, row);
+  // A fresh structure holds an empty text in every field.
+  EndWithResult(output, GetOutputStructure());
 }
 
 }  // namespace TarnNamespace

@@ -1,8 +1,8 @@
 #include "CGList.h"
 
-#include "CommandSpecs.h"
-#include "GroupListing.h"
-#include "SharedParameters.h"
+#include "support/CommandSpecs.h"
+#include "support/GroupListing.h"
+#include "support/SharedParameters.h"
 
 namespace HalvikCli {
 namespace TarnNamespace {
@@ -13,6 +13,10 @@ using Fendle::MetaObj::MetaType;
 namespace {
 
 constexpr char kDescription[] = "List Consistency Group IDs.";
+constexpr char kRowStructure[] = "CGList";
+const FieldNames kRowFields = {
+    "CgId",  "Name",    "Description", "DestinationArrayId", "FailOverArrayId", "SourceArrayId",
+    "State", "Warning", "Error"};
 
 }  // namespace
 
@@ -21,9 +25,7 @@ boost::shared_ptr<CGList> CGList::New() { return boost::shared_ptr<CGList>(new C
 CGList::CGList() {
   SetDescription(kDescription);
   SetDefaultOutputFormatter(kTableFormatter);
-  SetDefaultOutputParameter("fields:CGList",
-                            "CgId,Name,Description,DestinationArrayId,FailOverArrayId,"
-                            "SourceArrayId,State,Warning,Error");
+  SetDefaultOutputParameter(FieldsHintKey(kRowStructure), JoinFieldNames(kRowFields));
   SetMetaDataField(kTypeField, kFetcherKind);
 }
 
@@ -36,8 +38,7 @@ boost::shared_ptr<Fendle::CallSpec::OutputSpec> CGList::GetOutputSpecInternal() 
 }
 
 boost::shared_ptr<Fendle::MetaObj::MetaStruct> CGList::GetOutputStructure() {
-  return NewTextStruct("CGList", {"CgId", "Name", "Description", "DestinationArrayId",
-                                  "FailOverArrayId", "SourceArrayId", "State", "Warning", "Error"});
+  return NewTextStruct(kRowStructure, kRowFields);
 }
 
 void CGList::ExecuteInternal(const boost::shared_ptr<Fendle::CallSpec::Input>& input,

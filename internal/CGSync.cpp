@@ -1,10 +1,10 @@
 #include "CGSync.h"
 
-#include "CommandSpecs.h"
-#include "GroupListing.h"
-#include "SharedParameters.h"
 #include "TarnLib/TarnLib.h"
-#include "TarnLibBracket.h"
+#include "support/CommandSpecs.h"
+#include "support/GroupListing.h"
+#include "support/SharedParameters.h"
+#include "support/TarnLibBracket.h"
 
 namespace HalvikCli {
 namespace TarnNamespace {
@@ -17,6 +17,12 @@ namespace {
 constexpr char kDescription[] = "Sync Consistency Group IDs.";
 constexpr char kSource[] = "internal/CGSync";
 constexpr int kInitLine = 52;
+constexpr char kRowStructure[] = "CGSync";
+constexpr char kCgIdField[] = "CgId";
+const FieldNames kRowFields = {kCgIdField, "RpId", "TimeStamp", "Warning", "Error"};
+// The heading hint is declared for "CgSync", a spelling no structure has, so
+// records show the structure name as their heading.
+constexpr char kHeadingStructure[] = "CgSync";
 
 }  // namespace
 
@@ -25,8 +31,8 @@ boost::shared_ptr<CGSync> CGSync::New() { return boost::shared_ptr<CGSync>(new C
 CGSync::CGSync() {
   SetDescription(kDescription);
   SetDefaultOutputFormatter(kSimpleFormatter);
-  SetDefaultOutputParameter("header:CgSync", "%CgId%");
-  SetDefaultOutputParameter("fields:CGSync", "CgId,RpId,TimeStamp,Warning,Error");
+  SetDefaultOutputParameter(HeaderHintKey(kHeadingStructure), FieldReference(kCgIdField));
+  SetDefaultOutputParameter(FieldsHintKey(kRowStructure), JoinFieldNames(kRowFields));
   SetMetaDataField(kTypeField, kOperationKind);
   OpenTarnLib(kSource, kInitLine);
 }
@@ -42,7 +48,7 @@ boost::shared_ptr<Fendle::CallSpec::OutputSpec> CGSync::GetOutputSpecInternal() 
 }
 
 boost::shared_ptr<Fendle::MetaObj::MetaStruct> CGSync::GetOutputStructure() {
-  return NewTextStruct("CGSync", {"CgId", "RpId", "TimeStamp", "Warning", "Error"});
+  return NewTextStruct(kRowStructure, kRowFields);
 }
 
 void CGSync::ExecuteInternal(const boost::shared_ptr<Fendle::CallSpec::Input>& input,

@@ -9,14 +9,14 @@
 #include <string>
 #include <string_view>
 
-#include "CommandEndings.h"
-#include "CommandSpecs.h"
-#include "ConfigTarnAction.h"
 #include "HostCtl/Lib.h"
 #include "OskCtl/Storage.h"
-#include "ParameterNames.h"
-#include "SharedParameters.h"
-#include "TarnFileSystemList.h"
+#include "support/CommandEndings.h"
+#include "support/CommandSpecs.h"
+#include "support/ConfigTarnAction.h"
+#include "support/ParameterNames.h"
+#include "support/SharedParameters.h"
+#include "support/TarnFileSystemList.h"
 
 namespace HalvikCli {
 namespace TarnNamespace {

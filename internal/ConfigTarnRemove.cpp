@@ -1,8 +1,8 @@
 #include "ConfigTarnRemove.h"
 
-#include "CommandSpecs.h"
-#include "ConfigTarnAction.h"
-#include "SharedParameters.h"
+#include "support/CommandSpecs.h"
+#include "support/ConfigTarnAction.h"
+#include "support/SharedParameters.h"
 
 namespace HalvikCli {
 namespace TarnNamespace {

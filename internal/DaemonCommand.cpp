@@ -5,14 +5,14 @@
 #include <sstream>
 #include <vector>
 
-#include "CommandEndings.h"
-#include "CommandSpecs.h"
 #include "HostCtl/Storage.h"
 #include "OskCtl/Storage.h"
-#include "ParameterNames.h"
-#include "SharedParameters.h"
 #include "TarnLib/TarnLib.h"
-#include "TarnLibBracket.h"
+#include "support/CommandEndings.h"
+#include "support/CommandSpecs.h"
+#include "support/Int32Values.h"
+#include "support/ParameterNames.h"
+#include "support/TarnLibBracket.h"
 
 namespace HalvikCli {
 namespace TarnNamespace {
@@ -23,6 +23,7 @@ namespace {
 
 constexpr char kDescription[] = "Daemon Command for tarn Operations.";
 constexpr char kSource[] = "internal/DaemonCommand";
+constexpr int kInitLine = 75;
 
 // The daemon's log levels, tried in this order.
 struct LogLevelWord {
@@ -72,7 +73,7 @@ boost::shared_ptr<DaemonCommand> DaemonCommand::New() {
 DaemonCommand::DaemonCommand() {
   SetDescription(kDescription);
   SetMetaDataField(kTypeField, kOperationKind);
-  OpenTarnLib(kSource, __LINE__);
+  OpenTarnLib(kSource, kInitLine);
 }
 
 DaemonCommand::~DaemonCommand() { TarnLib_Exit(); }

@@ -1,10 +1,10 @@
 #include "FaultInjectionEnable.h"
 
-#include "CommandEndings.h"
-#include "CommandSpecs.h"
-#include "ParameterNames.h"
 #include "TarnLib/TarnLib.h"
-#include "TarnLibBracket.h"
+#include "support/CommandEndings.h"
+#include "support/CommandSpecs.h"
+#include "support/ParameterNames.h"
+#include "support/TarnLibBracket.h"
 
 namespace HalvikCli {
 namespace TarnNamespace {
@@ -15,6 +15,7 @@ namespace {
 
 constexpr char kDescription[] = "Enable or disable Kiro Fault Injection.";
 constexpr char kSource[] = "internal/FaultInjectionEnable";
+constexpr int kInitLine = 45;
 constexpr char kChangeFailed[] = "Failed to change the fault injection status.";
 
 }  // namespace
@@ -42,7 +43,7 @@ boost::shared_ptr<Fendle::CallSpec::OutputSpec> FaultInjectionEnable::GetOutputS
 void FaultInjectionEnable::ExecuteInternal(
     const boost::shared_ptr<Fendle::CallSpec::Input>& input,
     const boost::shared_ptr<Fendle::CallSpec::Output>& output) {
-  InvocationBracket bracket(kSource, __LINE__);
+  InvocationBracket bracket(kSource, kInitLine);
   if (TarnLib_SetFaultInjectionEnabled(input->GetBool(kEnabled))) {
     EndWithTrue(output);
   } else {

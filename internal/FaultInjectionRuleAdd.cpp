@@ -1,11 +1,11 @@
 #include "FaultInjectionRuleAdd.h"
 
-#include "CommandEndings.h"
-#include "CommandSpecs.h"
-#include "FaultInjectionRule.h"
-#include "SharedParameters.h"
 #include "TarnLib/TarnLib.h"
-#include "TarnLibBracket.h"
+#include "support/CommandEndings.h"
+#include "support/CommandSpecs.h"
+#include "support/FaultInjectionRule.h"
+#include "support/SharedParameters.h"
+#include "support/TarnLibBracket.h"
 
 namespace HalvikCli {
 namespace TarnNamespace {
@@ -14,6 +14,7 @@ namespace {
 
 constexpr char kDescription[] = "Add a fault injection rule.";
 constexpr char kSource[] = "internal/FaultInjectionRuleAdd";
+constexpr int kInitLine = 47;
 
 constexpr FaultRuleAction kAction = {
     &TarnLib_AddFaultInjectionRule,
@@ -44,7 +45,7 @@ boost::shared_ptr<Fendle::CallSpec::OutputSpec> FaultInjectionRuleAdd::GetOutput
 void FaultInjectionRuleAdd::ExecuteInternal(
     const boost::shared_ptr<Fendle::CallSpec::Input>& input,
     const boost::shared_ptr<Fendle::CallSpec::Output>& output) {
-  InvocationBracket bracket(kSource, __LINE__);
+  InvocationBracket bracket(kSource, kInitLine);
   ExecuteFaultRule(*input, output, kAction);
 }
 

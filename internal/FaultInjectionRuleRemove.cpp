@@ -2,13 +2,13 @@
 
 #include <string>
 
-#include "CommandEndings.h"
-#include "CommandSpecs.h"
-#include "FaultInjectionRule.h"
-#include "ParameterNames.h"
-#include "SharedParameters.h"
 #include "TarnLib/TarnLib.h"
-#include "TarnLibBracket.h"
+#include "support/CommandEndings.h"
+#include "support/CommandSpecs.h"
+#include "support/FaultInjectionRule.h"
+#include "support/ParameterNames.h"
+#include "support/SharedParameters.h"
+#include "support/TarnLibBracket.h"
 
 namespace HalvikCli {
 namespace TarnNamespace {
@@ -19,6 +19,7 @@ namespace {
 
 constexpr char kDescription[] = "Removes a fault injection rule.";
 constexpr char kSource[] = "internal/FaultInjectionRuleRemove";
+constexpr int kInitLine = 52;
 constexpr char kRemoveFailed[] = "The injection rule could not be removed.";
 
 }  // namespace
@@ -49,7 +50,7 @@ boost::shared_ptr<Fendle::CallSpec::OutputSpec> FaultInjectionRuleRemove::GetOut
 void FaultInjectionRuleRemove::ExecuteInternal(
     const boost::shared_ptr<Fendle::CallSpec::Input>& input,
     const boost::shared_ptr<Fendle::CallSpec::Output>& output) {
-  InvocationBracket bracket(kSource, __LINE__);
+  InvocationBracket bracket(kSource, kInitLine);
   const std::string fault = input->GetString(kFault);
   const std::string operation = ReadRuleOperation(*input);
   // A modify without frequency and time removes the rule.

@@ -1,11 +1,11 @@
 #include "FaultInjectionRuleSet.h"
 
-#include "CommandEndings.h"
-#include "CommandSpecs.h"
-#include "FaultInjectionRule.h"
-#include "SharedParameters.h"
 #include "TarnLib/TarnLib.h"
-#include "TarnLibBracket.h"
+#include "support/CommandEndings.h"
+#include "support/CommandSpecs.h"
+#include "support/FaultInjectionRule.h"
+#include "support/SharedParameters.h"
+#include "support/TarnLibBracket.h"
 
 namespace HalvikCli {
 namespace TarnNamespace {
@@ -14,6 +14,7 @@ namespace {
 
 constexpr char kDescription[] = "Modify a fault injection rule.";
 constexpr char kSource[] = "internal/FaultInjectionRuleSet";
+constexpr int kInitLine = 47;
 
 constexpr FaultRuleAction kAction = {
     &TarnLib_ModifyFaultInjectionRule,
@@ -44,7 +45,7 @@ boost::shared_ptr<Fendle::CallSpec::OutputSpec> FaultInjectionRuleSet::GetOutput
 void FaultInjectionRuleSet::ExecuteInternal(
     const boost::shared_ptr<Fendle::CallSpec::Input>& input,
     const boost::shared_ptr<Fendle::CallSpec::Output>& output) {
-  InvocationBracket bracket(kSource, __LINE__);
+  InvocationBracket bracket(kSource, kInitLine);
   ExecuteFaultRule(*input, output, kAction);
 }
 

@@ -2,11 +2,11 @@
 
 #include <string>
 
-#include "CommandEndings.h"
-#include "CommandSpecs.h"
 #include "HostCtl/Lib.h"
 #include "OskCtl/Storage.h"
-#include "ParameterNames.h"
+#include "support/CommandEndings.h"
+#include "support/CommandSpecs.h"
+#include "support/ParameterNames.h"
 
 namespace HalvikCli {
 namespace TarnNamespace {

@@ -4,12 +4,12 @@
 #include <string>
 #include <vector>
 
-#include "CommandEndings.h"
-#include "CommandSpecs.h"
 #include "HostCtl/Lib.h"
 #include "HostCtl/Storage.h"
 #include "OskCtl/Storage.h"
-#include "ParameterNames.h"
+#include "support/CommandEndings.h"
+#include "support/CommandSpecs.h"
+#include "support/ParameterNames.h"
 
 namespace HalvikCli {
 namespace TarnNamespace {
@@ -52,11 +52,13 @@ void StorageContainerAdd::ExecuteInternal(
   std::string id = input->GetString(kContainerId);
   const std::vector<std::string> arrayIds = input->GetStringList(kArray);
   try {
-    std::unique_ptr<HostCtl::Storage::TarnFileSystem> system(
-        storageInfo.AddTarnFileSystem(name, id, arrayIds, true));
-    // A host that mounted nothing answers false, without an error of its own.
-    output->SetResult(Fendle::MetaObj::MetaBool::New(system != nullptr));
-    system.reset();
+    {
+      // The file system object is destroyed before Finish.
+      const std::unique_ptr<HostCtl::Storage::TarnFileSystem> system(
+          storageInfo.AddTarnFileSystem(name, id, arrayIds, true));
+      // A host that mounted nothing answers false, without an error of its own.
+      output->SetResult(Fendle::MetaObj::MetaBool::New(system != nullptr));
+    }
     output->Finish();
   } catch (const HostCtl::Lib::HostCtlException& e) {
     EndWithError(output, e.GetMessage(false));

@@ -5,14 +5,14 @@
 #include <memory>
 #include <string>
 
-#include "CommandEndings.h"
-#include "CommandSpecs.h"
-#include "DaemonTexts.h"
 #include "HostCtl/Lib.h"
 #include "OskCtl/Storage.h"
-#include "ParameterNames.h"
 #include "TarnLib/TarnLib.h"
-#include "TarnLibBracket.h"
+#include "support/CommandEndings.h"
+#include "support/CommandSpecs.h"
+#include "support/DaemonRecords.h"
+#include "support/ParameterNames.h"
+#include "support/TarnLibBracket.h"
 
 namespace HalvikCli {
 namespace TarnNamespace {
@@ -32,15 +32,11 @@ constexpr int kInitLine = 40;
 constexpr char kRowStructure[] = "TarnsAreAccessible";
 constexpr char kTarnIdField[] = "TarnId";
 constexpr char kStatusField[] = "Status";
+const FieldNames kRowFields = {kTarnIdField, kStatusField};
 constexpr char kBadPath[] = "Bad datastore path";
 constexpr char kQueryFailedPrefix[] = "Unable to list the config-tarns of container ";
 // Asks the daemon for every config-tarn at once.
 constexpr int32_t kAllEntries = 2147483647;
-
-struct FreeQueryResult {
-  void operator()(QueryResult* result) const { TarnLib_FreeQueryResult(result); }
-};
-typedef std::unique_ptr<QueryResult, FreeQueryResult> QueryResultOwner;
 
 // Appends the ids of the container's config-tarns to ids, in the daemon's
 // order, and answers the query's status. The result is given back whether the
@@ -87,7 +83,7 @@ StorageContainerCheckTarns::StorageContainerCheckTarns() {
   SetDescription(kDescription);
   SetMetaDataField(kTypeField, kOperationKind);
   SetDefaultOutputFormatter(kTableFormatter);
-  SetDefaultOutputParameter("fields:TarnsAreAccessible", "TarnId,Status");
+  SetDefaultOutputParameter(FieldsHintKey(kRowStructure), JoinFieldNames(kRowFields));
   OpenTarnLib(kSource, kInitLine);
 }
 
@@ -106,7 +102,7 @@ StorageContainerCheckTarns::GetOutputSpecInternal() {
 }
 
 boost::shared_ptr<Fendle::MetaObj::MetaStruct> StorageContainerCheckTarns::GetOutputStructure() {
-  return NewTextStruct(kRowStructure, {kTarnIdField, kStatusField});
+  return NewTextStruct(kRowStructure, kRowFields);
 }
 
 boost::shared_ptr<MetaList> StorageContainerCheckTarns::GetAccessibilityList(
@@ -150,9 +146,10 @@ void StorageContainerCheckTarns::ExecuteInternal(
     // Rows pair ids and states by position; a short or long answer would drop
     // tarns or invent them.
     if (states.size() != tarnIds.size()) {
-      EndWithError(output, "The host answered " +
-                               Counted(states.size(), "accessibility state", "accessibility states") +
-                               " for " + Counted(tarnIds.size(), "tarn", "tarns"));
+      EndWithError(output,
+                   "The host answered " +
+                       Counted(states.size(), "accessibility state", "accessibility states") +
+                       " for " + Counted(tarnIds.size(), "tarn", "tarns"));
       return;
     }
     EndWithResult(output, GetAccessibilityList(tarnIds, states));

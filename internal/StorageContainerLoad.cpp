@@ -4,15 +4,15 @@
 #include <memory>
 #include <sstream>
 
-#include "CommandEndings.h"
-#include "CommandSpecs.h"
-#include "DaemonTexts.h"
 #include "HostCtl/Lib.h"
 #include "HostCtl/Storage.h"
 #include "OskCtl/Storage.h"
-#include "TarnFileSystemList.h"
 #include "TarnLib/TarnLib.h"
-#include "TarnLibBracket.h"
+#include "support/CommandEndings.h"
+#include "support/CommandSpecs.h"
+#include "support/DaemonRecords.h"
+#include "support/TarnFileSystemList.h"
+#include "support/TarnLibBracket.h"
 
 namespace HalvikCli {
 namespace TarnNamespace {
@@ -47,13 +47,6 @@ constexpr char kLoadFailedPrefix[] = "Unable to load Tarn datastores: ";
 constexpr char kMountFailedPrefix[] = "Error getting/adding tarn file system '";
 constexpr char kMountFailedSuffix[] = ", skipping";
 constexpr char kNothingMountedPrefix[] = "no file system was returned for container ";
-
-struct FreeStorageContainerResult {
-  void operator()(StorageContainerResult* result) const {
-    TarnLib_FreeStorageContainerResult(result);
-  }
-};
-typedef std::unique_ptr<StorageContainerResult, FreeStorageContainerResult> ContainerResultOwner;
 
 // The NFS4x addresses of an endpoint joined by commas.
 std::string JoinAddresses(const ProtocolEndpointRecord& endpoint) {
@@ -134,11 +127,12 @@ StorageContainerLoad::StorageContainerLoad() {
   SetDescription(kDescription);
   SetMetaDataField(kTypeField, kOperationKind);
   SetDefaultOutputFormatter(kSimpleFormatter);
-  SetDefaultOutputParameter("header:StorageContainer", "%StorageContainer Name%");
-  SetDefaultOutputParameter("header:Array", "%ArrayId%");
+  SetDefaultOutputParameter(HeaderHintKey(kContainerStructure),
+                            FieldReference(kContainerNameField));
+  SetDefaultOutputParameter(HeaderHintKey(kArrayStructure), FieldReference(kArrayIdField));
   SetDefaultOutputParameter(
-      "table-columns",
-      "StorageContainer Name,StorageContainer Id,Max Tarn Size (MB),VP URL,Arrays");
+      "table-columns", JoinFieldNames({kContainerNameField, kContainerIdField, kMaxTarnSizeField,
+                                       kVpUrlField, kArraysField}));
   OpenTarnLib(kSource, kInitLine);
 }
 

@@ -4,11 +4,11 @@
 #include <cstdint>
 #include <string>
 
-#include "CommandEndings.h"
-#include "CommandSpecs.h"
-#include "ParameterNames.h"
 #include "TarnLib/TarnLib.h"
-#include "TarnLibBracket.h"
+#include "support/CommandEndings.h"
+#include "support/CommandSpecs.h"
+#include "support/ParameterNames.h"
+#include "support/TarnLibBracket.h"
 
 namespace HalvikCli {
 namespace TarnNamespace {

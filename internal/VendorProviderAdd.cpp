@@ -4,13 +4,13 @@
 #include <string>
 #include <vector>
 
-#include "CommandEndings.h"
-#include "CommandSpecs.h"
 #include "HostCtl/Lib.h"
 #include "HostCtl/Storage.h"
 #include "OskCtl/Storage.h"
-#include "ParameterNames.h"
-#include "ProviderArrays.h"
+#include "support/CommandEndings.h"
+#include "support/CommandSpecs.h"
+#include "support/ParameterNames.h"
+#include "support/ProviderArrays.h"
 
 namespace HalvikCli {
 namespace TarnNamespace {

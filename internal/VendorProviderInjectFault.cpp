@@ -5,13 +5,14 @@
 #include <string>
 #include <vector>
 
-#include "CommandEndings.h"
-#include "CommandSpecs.h"
 #include "HostCtl/Lib.h"
 #include "HostCtl/Storage.h"
 #include "OskCtl/Storage.h"
-#include "ParameterNames.h"
 #include "TarnLib/TarnLib.h"
+#include "support/CommandEndings.h"
+#include "support/CommandSpecs.h"
+#include "support/ParameterNames.h"
+#include "support/ProviderArrays.h"
 
 namespace HalvikCli {
 namespace TarnNamespace {
@@ -23,18 +24,11 @@ namespace {
 constexpr char kDescription[] = "Inject Kiro Provider related fault in Tarnd for debugging.";
 constexpr char kDefaultStatus[] = "default";
 constexpr char kUnknownProviderPrefix[] = "VP : ";
-constexpr char kDoesNotExistSuffix[] = " does not exist";
 constexpr char kMissingArrayOrFlag[] = "Missing one of the parameter arrayId or isActive";
 constexpr char kLookupFailedPrefix[] = "InjectFault failed for VP";
 constexpr char kInjectedPrefix[] = "Successfully Injected fault for VP with name : ";
 constexpr char kDaemonFailedPrefix[] = "VendorProviderInjectFault failed for VP with name : ";
 constexpr char kDaemonErrorInfix[] = " with error: ";
-
-void EndWithUnknownProvider(const OutputPtr& output, const std::string& name) {
-  std::ostringstream text;
-  text << kUnknownProviderPrefix << name << kDoesNotExistSuffix << std::endl;
-  EndWithError(output, text.str());
-}
 
 }  // namespace
 
@@ -74,7 +68,7 @@ void VendorProviderInjectFault::ExecuteInternal(
   }
 
   if (!storageInfo.TarnVpExists(name)) {
-    EndWithUnknownProvider(output, name);
+    EndWithUnknownProvider(output, kUnknownProviderPrefix, name);
     return;
   }
   // The table borrows the texts of arrayIds, which outlives the daemon call.
@@ -94,13 +88,10 @@ void VendorProviderInjectFault::ExecuteInternal(
   // fault, so a failed or empty lookup ends the command.
   std::string url;
   try {
-    std::vector<HostCtl::Storage::VendorProviderInfo> known;
-    storageInfo.GetTarnVendorProviders(name, known);
-    if (known.empty()) {
-      EndWithUnknownProvider(output, name);
+    if (!LookUpStoredProviderUrl(storageInfo, name, url)) {
+      EndWithUnknownProvider(output, kUnknownProviderPrefix, name);
       return;
     }
-    url = known.front().url;
   } catch (const HostCtl::Lib::HostCtlException& e) {
     EndWithError(output, kLookupFailedPrefix + e.GetMessage(false));
     return;

@@ -2,13 +2,13 @@
 
 #include <string>
 
-#include "CommandEndings.h"
-#include "CommandSpecs.h"
 #include "HostCtl/Lib.h"
 #include "OskCtl/Storage.h"
-#include "ParameterNames.h"
 #include "TarnLib/TarnLib.h"
-#include "TarnLibBracket.h"
+#include "support/CommandEndings.h"
+#include "support/CommandSpecs.h"
+#include "support/ParameterNames.h"
+#include "support/TarnLibBracket.h"
 
 namespace HalvikCli {
 namespace TarnNamespace {

@@ -4,13 +4,13 @@
 #include <string>
 #include <vector>
 
-#include "CommandEndings.h"
-#include "CommandSpecs.h"
 #include "HostCtl/Lib.h"
 #include "HostCtl/Storage.h"
 #include "OskCtl/Storage.h"
-#include "ParameterNames.h"
-#include "ProviderArrays.h"
+#include "support/CommandEndings.h"
+#include "support/CommandSpecs.h"
+#include "support/ParameterNames.h"
+#include "support/ProviderArrays.h"
 
 namespace HalvikCli {
 namespace TarnNamespace {
@@ -22,15 +22,8 @@ namespace {
 
 constexpr char kDescription[] = "Update an existing Kiro Provider on the host.";
 constexpr char kCannotUpdatePrefix[] = "Cannot Update VP as : ";
-constexpr char kDoesNotExistSuffix[] = " does not exist";
 constexpr char kUpdatedPrefix[] = "Successfully Updated VP with name : ";
 constexpr char kFailedPrefix[] = "Failed to update VP";
-
-void EndWithUnknownProvider(const OutputPtr& output, const std::string& name) {
-  std::ostringstream text;
-  text << kCannotUpdatePrefix << name << kDoesNotExistSuffix << std::endl;
-  EndWithError(output, text.str());
-}
 
 }  // namespace
 
@@ -65,7 +58,7 @@ void VendorProviderSet::ExecuteInternal(const boost::shared_ptr<Fendle::CallSpec
   const std::string name = input->GetString(kVpName);
 
   if (!storageInfo.TarnVpExists(name)) {
-    EndWithUnknownProvider(output, name);
+    EndWithUnknownProvider(output, kCannotUpdatePrefix, name);
     return;
   }
   std::vector<HostCtl::Storage::RelatedStorageArrayInfo> arrays;
@@ -76,15 +69,13 @@ void VendorProviderSet::ExecuteInternal(const boost::shared_ptr<Fendle::CallSpec
   }
 
   try {
-    std::vector<VendorProviderInfo> known;
-    storageInfo.GetTarnVendorProviders(name, known);
+    std::string url;
     // The provider went away since the existence test: there is no URL to keep.
-    if (known.empty()) {
-      EndWithUnknownProvider(output, name);
+    if (!LookUpStoredProviderUrl(storageInfo, name, url)) {
+      EndWithUnknownProvider(output, kCannotUpdatePrefix, name);
       return;
     }
-    const std::vector<VendorProviderInfo> providers(
-        1, MakeProviderRecord(name, known.front().url, arrays));
+    const std::vector<VendorProviderInfo> providers(1, MakeProviderRecord(name, url, arrays));
     storageInfo.UpdateTarnVendorProvider(providers);
     std::ostringstream text;
     text << kUpdatedPrefix << name << std::endl;

@@ -3,12 +3,13 @@
 #include <cstdint>
 #include <cstring>
 
-#include "CommandEndings.h"
-#include "CommandSpecs.h"
-#include "SharedParameters.h"
 #include "TarnLib/TarnLib.h"
-#include "TarnLibBracket.h"
-#include "VirtualVolumeQuery.h"
+#include "support/CommandEndings.h"
+#include "support/CommandSpecs.h"
+#include "support/DaemonRecords.h"
+#include "support/SharedParameters.h"
+#include "support/TarnLibBracket.h"
+#include "support/VirtualVolumeQuery.h"
 
 namespace HalvikCli {
 namespace TarnNamespace {
@@ -24,6 +25,7 @@ constexpr char kDescription[] = "Get information about a Virtual Volume.";
 constexpr char kSource[] = "internal/VirtualVolumeGet";
 constexpr int kInitLine = 102;
 
+constexpr char kInfoStructure[] = "TarnInfoInternal";
 constexpr char kTarnUuid[] = "Tarn UUID";
 constexpr char kContainerIdField[] = "Container Id";
 constexpr char kLogicalSize[] = "Logical Size";
@@ -32,6 +34,7 @@ constexpr char kUnsharedSize[] = "Unshared Size";
 constexpr char kUnsharedSizeValid[] = "Unshared Size Valid";
 constexpr char kStorageProfile[] = "Storage Profile";
 constexpr char kBlockSize[] = "Block Size";
+constexpr char kMegabytes[] = "MB";
 
 // Each failed question ends the command with its own text. A question that
 // succeeds without handing out a record has failed as well.
@@ -49,12 +52,13 @@ VirtualVolumeGet::VirtualVolumeGet() {
   SetDescription(kDescription);
   SetMetaDataField(kTypeField, kOperationKind);
   SetDefaultOutputFormatter(kSimpleFormatter);
-  SetDefaultOutputParameter("units:TarnInfoInternal.Logical Size", "MB");
-  SetDefaultOutputParameter("units:TarnInfoInternal.Committed Size", "MB");
-  SetDefaultOutputParameter("units:TarnInfoInternal.Unshared Size", "MB");
-  SetDefaultOutputParameter("fields:TarnInfoInternal",
-                            "Container Id,Tarn UUID,Logical Size,Committed Size,"
-                            "Unshared Size Valid,Unshared Size,Storage Profile,Block Size");
+  for (const char* sized : {kLogicalSize, kCommittedSize, kUnsharedSize}) {
+    SetDefaultOutputParameter(UnitsHintKey(kInfoStructure, sized), kMegabytes);
+  }
+  SetDefaultOutputParameter(
+      FieldsHintKey(kInfoStructure),
+      JoinFieldNames({kContainerIdField, kTarnUuid, kLogicalSize, kCommittedSize,
+                      kUnsharedSizeValid, kUnsharedSize, kStorageProfile, kBlockSize}));
 }
 
 boost::shared_ptr<Fendle::CallSpec::InputSpec> VirtualVolumeGet::GetInputSpecInternal() {
@@ -66,7 +70,7 @@ boost::shared_ptr<Fendle::CallSpec::OutputSpec> VirtualVolumeGet::GetOutputSpecI
 }
 
 boost::shared_ptr<MetaStruct> VirtualVolumeGet::GetOutputStructure() {
-  boost::shared_ptr<MetaStruct> info = MetaStruct::New("TarnInfoInternal");
+  boost::shared_ptr<MetaStruct> info = MetaStruct::New(kInfoStructure);
   info->SetField(kTarnUuid, MetaString::New());
   info->SetField(kContainerIdField, MetaString::New());
   info->SetField(kLogicalSize, MetaInt::New());
@@ -117,9 +121,7 @@ void VirtualVolumeGet::ExecuteInternal(const boost::shared_ptr<Fendle::CallSpec:
       EndWithError(output, kStorageProfileFailed);
       return;
     }
-    if (tarnInfo->storageProfile != nullptr) {
-      info->SetField(kStorageProfile, tarnInfo->storageProfile);
-    }
+    SetTextIfPresent(*info, kStorageProfile, tarnInfo->storageProfile);
   }
   {
     void* chunksBlock = nullptr;

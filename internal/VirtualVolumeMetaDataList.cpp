@@ -1,11 +1,12 @@
 #include "VirtualVolumeMetaDataList.h"
 
-#include "CommandEndings.h"
-#include "CommandSpecs.h"
-#include "SharedParameters.h"
 #include "TarnLib/TarnLib.h"
-#include "TarnLibBracket.h"
-#include "VirtualVolumeQuery.h"
+#include "support/CommandEndings.h"
+#include "support/CommandSpecs.h"
+#include "support/DaemonRecords.h"
+#include "support/SharedParameters.h"
+#include "support/TarnLibBracket.h"
+#include "support/VirtualVolumeQuery.h"
 
 namespace HalvikCli {
 namespace TarnNamespace {
@@ -20,17 +21,11 @@ constexpr char kDescription[] = "List Virtual Volume MetaData.";
 constexpr char kSource[] = "internal/VirtualVolumeMetaDataList";
 constexpr int kInitLine = 88;
 
+constexpr char kRowStructure[] = "TarnMetaData";
 constexpr char kKey[] = "key";
 constexpr char kValue[] = "value";
 // Also when the query succeeds without handing out a record.
 constexpr char kMetadataFailed[] = "Failed to get the metadata for Tarn.";
-
-// A text the entry lacks stays the row's empty text.
-void SetTextField(MetaStruct& row, const char* field, const char* text) {
-  if (text != nullptr) {
-    row.SetField(field, text);
-  }
-}
 
 }  // namespace
 
@@ -53,7 +48,7 @@ boost::shared_ptr<Fendle::CallSpec::OutputSpec> VirtualVolumeMetaDataList::GetOu
 }
 
 boost::shared_ptr<Fendle::MetaObj::MetaStruct> VirtualVolumeMetaDataList::GetOutputStructure() {
-  return NewTextStruct("TarnMetaData", {kKey, kValue});
+  return NewTextStruct(kRowStructure, {kKey, kValue});
 }
 
 void VirtualVolumeMetaDataList::ExecuteInternal(
@@ -78,8 +73,8 @@ void VirtualVolumeMetaDataList::ExecuteInternal(
   boost::shared_ptr<MetaList> rows = MetaList::New(MetaType::Struct, GetOutputStructure());
   for (const TarnMetadataEntry* entry = metadata->first; entry != nullptr; entry = entry->next) {
     boost::shared_ptr<MetaStruct> row = GetOutputStructure();
-    SetTextField(*row, kKey, entry->key);
-    SetTextField(*row, kValue, entry->value);
+    SetTextIfPresent(*row, kKey, entry->key);
+    SetTextIfPresent(*row, kValue, entry->value);
     rows->Append(row);
   }
   // The record is released by its owner after Finish.

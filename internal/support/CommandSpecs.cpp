@@ -1,4 +1,4 @@
-#include "CommandSpecs.h"
+#include "support/CommandSpecs.h"
 
 namespace HalvikCli {
 namespace TarnNamespace {
@@ -28,8 +28,8 @@ boost::shared_ptr<OutputSpec> DeclareResult(
   return spec;
 }
 
-boost::shared_ptr<Fendle::MetaObj::MetaStruct> NewTextStruct(
-    const char* structureName, std::initializer_list<const char*> fields) {
+boost::shared_ptr<Fendle::MetaObj::MetaStruct> NewTextStruct(const char* structureName,
+                                                             const FieldNames& fields) {
   boost::shared_ptr<Fendle::MetaObj::MetaStruct> row =
       Fendle::MetaObj::MetaStruct::New(structureName);
   for (const char* field : fields) {
@@ -37,6 +37,25 @@ boost::shared_ptr<Fendle::MetaObj::MetaStruct> NewTextStruct(
   }
   return row;
 }
+
+std::string FieldsHintKey(const char* structure) { return std::string("fields:") + structure; }
+
+std::string HeaderHintKey(const char* structure) { return std::string("header:") + structure; }
+
+std::string UnitsHintKey(const char* structure, const char* field) {
+  return std::string("units:") + structure + "." + field;
+}
+
+std::string JoinFieldNames(const FieldNames& fields) {
+  std::string joined;
+  for (const char* field : fields) {
+    if (!joined.empty()) joined += ',';
+    joined += field;
+  }
+  return joined;
+}
+
+std::string FieldReference(const char* field) { return std::string("%") + field + "%"; }
 
 }  // namespace TarnNamespace
 }  // namespace HalvikCli

@@ -1,4 +1,4 @@
-#include "TarnLibBracket.h"
+#include "support/TarnLibBracket.h"
 
 #include <boost/bind/bind.hpp>
 

@@ -6,8 +6,8 @@
 #include <cstdint>
 #include <string>
 
-#include "CommandEndings.h"
 #include "Fendle/CallSpec.h"
+#include "support/CommandEndings.h"
 
 namespace HalvikCli {
 namespace TarnNamespace {

@@ -5,9 +5,9 @@
 
 #include <boost/shared_ptr.hpp>
 
-#include "CommandEndings.h"
 #include "Fendle/CallSpec.h"
 #include "Fendle/MetaObj.h"
+#include "support/CommandEndings.h"
 
 namespace HalvikCli {
 namespace TarnNamespace {

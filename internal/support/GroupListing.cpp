@@ -1,7 +1,7 @@
-#include "GroupListing.h"
+#include "support/GroupListing.h"
 
-#include "ParameterNames.h"
-#include "TarnLibBracket.h"
+#include "support/ParameterNames.h"
+#include "support/TarnLibBracket.h"
 
 namespace HalvikCli {
 namespace TarnNamespace {

@@ -1,10 +1,7 @@
-#include "SharedParameters.h"
+#include "support/SharedParameters.h"
 
-#include <limits>
-#include <sstream>
-
-#include "CommandSpecs.h"
-#include "ParameterNames.h"
+#include "support/CommandSpecs.h"
+#include "support/ParameterNames.h"
 
 namespace HalvikCli {
 namespace TarnNamespace {
@@ -49,25 +46,6 @@ boost::shared_ptr<InputSpec> DeclareCgListParameters(const char* vpNameHelp) {
       {kCgId, "c", ParameterType::StringList, kRequired, "List of CG IDs."},
       {kVpName, "n", ParameterType::String, kRequired, vpNameHelp},
   });
-}
-
-bool NarrowToInt32(const char* name, int64_t value, int32_t& narrowed, std::string& error) {
-  constexpr int64_t kMin = std::numeric_limits<int32_t>::min();
-  constexpr int64_t kMax = std::numeric_limits<int32_t>::max();
-  if (value < kMin || value > kMax) {
-    std::ostringstream text;
-    text << "Invalid value for parameter " << name << ": " << value << " is outside the range "
-         << kMin << " to " << kMax;
-    error = text.str();
-    return false;
-  }
-  narrowed = static_cast<int32_t>(value);
-  return true;
-}
-
-bool ReadInt32(const Fendle::CallSpec::Input& input, const char* name, int32_t& value,
-               std::string& error) {
-  return NarrowToInt32(name, input.GetInt(name), value, error);
 }
 
 }  // namespace TarnNamespace

@@ -5,9 +5,9 @@
 
 #include <string>
 
-#include "CommandEndings.h"
 #include "Fendle/CallSpec.h"
 #include "HostCtl/Storage.h"
+#include "support/CommandEndings.h"
 
 namespace HalvikCli {
 namespace TarnNamespace {

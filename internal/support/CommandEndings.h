@@ -15,9 +15,6 @@ namespace TarnNamespace {
 
 typedef boost::shared_ptr<Fendle::CallSpec::Output> OutputPtr;
 
-// Reported by the commands whose work is not written yet.
-inline constexpr char kNotImplemented[] = "This command is not implemented yet.";
-
 // SetResult(result), then Finish.
 void EndWithResult(const OutputPtr& output,
                    const boost::shared_ptr<Fendle::MetaObj::MetaObject>& result);

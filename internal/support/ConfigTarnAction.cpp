@@ -1,9 +1,9 @@
-#include "ConfigTarnAction.h"
+#include "support/ConfigTarnAction.h"
 
 #include "HostCtl/Lib.h"
 #include "OskCtl/Storage.h"
-#include "ParameterNames.h"
-#include "TarnFileSystemList.h"
+#include "support/ParameterNames.h"
+#include "support/TarnFileSystemList.h"
 
 namespace HalvikCli {
 namespace TarnNamespace {

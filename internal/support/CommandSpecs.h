@@ -3,7 +3,8 @@
 #pragma once
 
 #include <boost/shared_ptr.hpp>
-#include <initializer_list>
+#include <string>
+#include <vector>
 
 #include "Fendle/CallSpec.h"
 #include "Fendle/MetaObj.h"
@@ -45,9 +46,25 @@ boost::shared_ptr<Fendle::CallSpec::InputSpec> DeclareParameters(
 boost::shared_ptr<Fendle::CallSpec::OutputSpec> DeclareResult(
     const boost::shared_ptr<Fendle::MetaObj::MetaObject>& prototype);
 
+// The field names of a structure, in the order given.
+typedef std::vector<const char*> FieldNames;
+
 // A structure named structureName with an empty text for each field, in order.
-boost::shared_ptr<Fendle::MetaObj::MetaStruct> NewTextStruct(
-    const char* structureName, std::initializer_list<const char*> fields);
+boost::shared_ptr<Fendle::MetaObj::MetaStruct> NewTextStruct(const char* structureName,
+                                                             const FieldNames& fields);
+
+// Output hints spelt from the same constants as the structures they describe,
+// so that a hint cannot name a field under another spelling.
+// "fields:<structure>"
+std::string FieldsHintKey(const char* structure);
+// "header:<structure>"
+std::string HeaderHintKey(const char* structure);
+// "units:<structure>.<field>"
+std::string UnitsHintKey(const char* structure, const char* field);
+// The names joined by commas, as "fields:" and "table-columns" take them.
+std::string JoinFieldNames(const FieldNames& fields);
+// "%<field>%", a field's value in a "header:" hint.
+std::string FieldReference(const char* field);
 
 }  // namespace TarnNamespace
 }  // namespace HalvikCli

@@ -1,6 +1,6 @@
-#include "VirtualVolumeQuery.h"
+#include "support/VirtualVolumeQuery.h"
 
-#include "ParameterNames.h"
+#include "support/ParameterNames.h"
 
 namespace HalvikCli {
 namespace TarnNamespace {

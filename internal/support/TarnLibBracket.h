@@ -8,6 +8,10 @@
 // Invocation bracket: the first statement of ExecuteInternal is
 //   InvocationBracket bracket("internal/<Class>", <line>);
 // which releases the library once when ExecuteInternal is left, by any path.
+//
+// The line is a fixed number kept in each command file as kInitLine, never
+// __LINE__: the failure report names it, scripts and people match on it, and
+// it must not move when the file is edited.
 #pragma once
 
 #include <boost/function.hpp>

@@ -1,5 +1,6 @@
-// The records the Kiro provider commands hand to the host, and the rule by
-// which `kiroprovider add` and `set` read a provider's arrays.
+// The records the Kiro provider commands hand to the host, the rule by which
+// `kiroprovider add` and `set` read a provider's arrays, and how `set` and
+// `injectfault` find the provider the host keeps.
 #pragma once
 
 #include <string>
@@ -7,6 +8,8 @@
 
 #include "Fendle/CallSpec.h"
 #include "HostCtl/Storage.h"
+#include "OskCtl/Storage.h"
+#include "support/CommandEndings.h"
 
 namespace HalvikCli {
 namespace TarnNamespace {
@@ -26,6 +29,15 @@ bool ReadProviderArrays(const Fendle::CallSpec::Input& input,
 HostCtl::Storage::VendorProviderInfo MakeProviderRecord(
     const std::string& name, const std::string& url,
     const std::vector<HostCtl::Storage::RelatedStorageArrayInfo>& arrays);
+
+// The URL of the provider the host keeps under name, from
+// GetTarnVendorProviders; false when the host answers no provider. Host
+// failures propagate.
+bool LookUpStoredProviderUrl(OskCtl::Storage::StorageInfoImpl& storageInfo, const std::string& name,
+                             std::string& url);
+
+// Ends with the error "<prefix><name> does not exist" and a line feed.
+void EndWithUnknownProvider(const OutputPtr& output, const char* prefix, const std::string& name);
 
 }  // namespace TarnNamespace
 }  // namespace HalvikCli

@@ -1,9 +1,10 @@
-#include "ProviderArrays.h"
+#include "support/ProviderArrays.h"
 
 #include <cstdint>
+#include <sstream>
 
-#include "ParameterNames.h"
-#include "SharedParameters.h"
+#include "support/Int32Values.h"
+#include "support/ParameterNames.h"
 
 namespace HalvikCli {
 namespace TarnNamespace {
@@ -46,6 +47,21 @@ HostCtl::Storage::VendorProviderInfo MakeProviderRecord(
   provider.url = url;
   provider.arrays = arrays;
   return provider;
+}
+
+bool LookUpStoredProviderUrl(OskCtl::Storage::StorageInfoImpl& storageInfo, const std::string& name,
+                             std::string& url) {
+  std::vector<HostCtl::Storage::VendorProviderInfo> known;
+  storageInfo.GetTarnVendorProviders(name, known);
+  if (known.empty()) return false;
+  url = known.front().url;
+  return true;
+}
+
+void EndWithUnknownProvider(const OutputPtr& output, const char* prefix, const std::string& name) {
+  std::ostringstream text;
+  text << prefix << name << " does not exist" << std::endl;
+  EndWithError(output, text.str());
 }
 
 }  // namespace TarnNamespace

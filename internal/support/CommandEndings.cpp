@@ -1,4 +1,4 @@
-#include "CommandEndings.h"
+#include "support/CommandEndings.h"
 
 #include <sstream>
 

@@ -1,4 +1,4 @@
-#include "TarnFileSystemList.h"
+#include "support/TarnFileSystemList.h"
 
 namespace HalvikCli {
 namespace TarnNamespace {

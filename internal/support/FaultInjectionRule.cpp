@@ -1,7 +1,7 @@
-#include "FaultInjectionRule.h"
+#include "support/FaultInjectionRule.h"
 
-#include "ParameterNames.h"
-#include "SharedParameters.h"
+#include "support/Int32Values.h"
+#include "support/ParameterNames.h"
 
 namespace HalvikCli {
 namespace TarnNamespace {
