@@ -122,7 +122,7 @@ TEST_F(StorageContainerTest, LoadReportsAFailingSinkAndLetsOtherExceptionsPass) 
 
 // Well-formed endpoints are checked end to end; these are the parts the
 // daemon may leave out.
-TEST(StorageContainerRecords, DescribeEndpointsAndReadMissingPartsAsEmpty) {
+TEST_F(StorageContainerTest, RecordsDescribeEndpointsAndReadMissingPartsAsEmpty) {
   char a[] = "a", b[] = "b", uid[] = "u1", m1[] = "m1";
   char* addresses[] = {a, nullptr, b};
   ProtocolEndpointAddress nfs4{2, m1, nullptr}, bare4{2, nullptr, nullptr}, other{3, m1, m1};

@@ -43,7 +43,9 @@ TEST_F(DaemonClient, StoppedDaemonRefusesOpeningAndCalls) {
   EXPECT_EQ(result, nullptr);
 }
 
-TEST(ContainerId, NormalisesValidFormsAndRejectsTheRest) {
+using ContainerIdForms = SimTest::FreshWorld;
+
+TEST_F(ContainerIdForms, NormalisesValidFormsAndRejectsTheRest) {
   const std::pair<const char*, bool> cases[] = {
       {"6f1c2f4e-8d3b-4c1a-9e2f-0a1b2c3d4e5f", true},
       {"6F1C2F4E-8D3B-4C1A-9E2F-0A1B2C3D4E5F", true},
