@@ -3,6 +3,7 @@
 #include <gtest/gtest.h>
 #include <sys/wait.h>
 
+#include <algorithm>
 #include <cstdlib>
 #include <filesystem>
 #include <fstream>
@@ -12,6 +13,7 @@
 #include "hyracli/Completion.h"
 #include "hyracli/HyraCli.h"
 #include "hyracli/ManPage.h"
+#include "hyracli/ToolOptionList.h"
 
 namespace {
 
@@ -121,6 +123,37 @@ TEST_F(GeneratorTest, CompletionWordNeedsExactlyOneKnownShell) {
   EXPECT_EQ(err.str().substr(0, 46), "hyracli: completion takes one shell: bash|zsh|");
   EXPECT_EQ(Hyracli::RunCompletion({"zsh"}, root_, out, err), Hyracli::kExitOk);
   EXPECT_EQ(out.str().substr(0, 17), "#compdef hyracli\n");
+}
+
+// The completion scripts and manual pages describe the global options from
+// their list; it must hold what the tool takes and what its help shows.
+TEST_F(GeneratorTest, GlobalOptionListMatchesWhatTheToolTakesAndShows) {
+  std::vector<std::string> listed;
+  for (const Hyracli::ToolOption& option : Hyracli::ToolOptionList()) {
+    listed.push_back("--" + option.name);
+    if (!option.alias.empty()) listed.push_back("-" + option.alias);
+    std::vector<std::string> args{"--" + option.name};
+    if (option.value == Hyracli::ToolOptionValue::Formatter) args.push_back("json");
+    if (option.value == Hyracli::ToolOptionValue::Directory) args.push_back("/tmp");
+    EXPECT_NO_THROW(Hyracli::ParseGlobalOptions(args)) << option.name;
+  }
+  std::ostringstream help, err;
+  ASSERT_EQ(Hyracli::Run({}, root_, help, err), Hyracli::kExitOk);
+  std::istringstream lines(help.str());
+  std::string line;
+  while (std::getline(lines, line) && line != "Global options:") {
+  }
+  int shown = 0;
+  while (std::getline(lines, line) && !line.empty()) {
+    std::istringstream words(line);
+    std::string word;
+    while (words >> word && word[0] == '-') {
+      if (word.back() == ',') word.pop_back();
+      EXPECT_NE(std::find(listed.begin(), listed.end(), word), listed.end()) << word;
+      ++shown;
+    }
+  }
+  EXPECT_GT(shown, 0);
 }
 
 }  // namespace

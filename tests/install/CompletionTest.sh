@@ -92,7 +92,34 @@ else
 fi
 
 if command -v zsh >/dev/null; then
-  zsh -n "$share/zsh/vendor-completions/_hyracli" || fail "zsh: the script does not parse"
+  zsh_script=$share/zsh/vendor-completions/_hyracli
+  zsh -n "$zsh_script" || fail "zsh: the script does not parse"
+  # zsh's completion builtins exist only inside its completion system; these
+  # stand-ins print every candidate offered (zsh itself filters by prefix).
+  zsh_expect() {
+    local want=$1 got
+    shift
+    got=$(zsh -f -c '
+      script=$1; shift
+      compdef() { : }
+      compset() { : }
+      _describe() { local -a l; l=("${(@P)4}"); print -r -- ${(j: :)${l%%:*}} }
+      compadd() { [[ $1 == -a ]] && print -r -- ${(j: :)${(P)2}} }
+      _directories() { print -r -- "(directories)" }
+      source $script
+      words=("$@")
+      CURRENT=$#
+      _hyracli' zsh-test "$zsh_script" "$@")
+    [[ $got == "$want" ]] || fail "zsh: '$*' gives '$got', not '$want'"
+  }
+  zsh_expect "storage completion" hyracli sto
+  zsh_expect "add set remove activate deactivate injectfault" "${tarn[@]}" kiroprovider ""
+  zsh_expect "--vp-name -v --vp-url -U --arrayid -a --priority -p --isactive -i --help" \
+    "${add[@]}" -v vp3 -
+  zsh_expect "true false" "${add[@]}" --isactive ""
+  zsh_expect "true false" "${add[@]}" --isactive=
+  zsh_expect "(directories)" hyracli --plugin-dir ""
+  zsh_expect "" hyracli storage bogus ""
 else
   echo "zsh is not installed: its script is not checked"
 fi
