@@ -368,7 +368,9 @@ void WriteFish(const std::vector<Stop>& stops, std::ostream& out) {
   for (const Stop& stop : stops) {
     for (const Option& option : stop.options) {
       if (option.value == Value::None) continue;
-      for (const std::string& word : WordsOf(option)) keys += " " + FishQuote(stop.path + "|" + word);
+      for (const std::string& word : WordsOf(option)) {
+        keys += " \\\n            " + FishQuote(stop.path + "|" + word);
+      }
     }
   }
   if (!keys.empty()) {
