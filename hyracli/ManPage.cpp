@@ -7,6 +7,7 @@
 #include <stdexcept>
 
 #include "fendle/Formatter.h"
+#include "hyracli/Completion.h"
 #include "hyracli/HyraCli.h"
 #include "hyracli/PluginLoader.h"
 #include "hyracli/ToolOptionList.h"
@@ -178,8 +179,11 @@ void WriteToolManPage(const boost::shared_ptr<NamespaceNode>& root, const ManPag
          ".RI [ options ]\n"
          ".br\n"
          ".B hyracli " << kCompletionWord << "\n"
-         ".BR bash | zsh | fish\n"
-         ".SH DESCRIPTION\n";
+         ".BR";
+  for (std::size_t i = 0; i < CompletionShells().size(); ++i) {
+    out << (i == 0 ? " " : " | ") << Typed(CompletionShells()[i]);
+  }
+  out << "\n.SH DESCRIPTION\n";
   WriteText(root->GetDescription(), out);
   out << ".PP\n"
          "The commands come from plug-ins, loaded at start from the plug-in directory (see\n"
