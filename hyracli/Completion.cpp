@@ -1,5 +1,6 @@
 #include "hyracli/Completion.h"
 
+#include <algorithm>
 #include <sstream>
 
 #include "fendle/Formatter.h"
@@ -473,7 +474,7 @@ int RunCompletion(const std::vector<std::string>& args,
   std::string shells;
   for (const std::string& shell : CompletionShells()) shells += (shells.empty() ? "" : "|") + shell;
   const std::string usage = std::string("Usage: hyracli ") + kCompletionWord + " " + shells + "\n";
-  if (args.size() == 1 && (args.front() == "--help" || args.front() == "-h")) {
+  if (std::find(args.begin(), args.end(), "--help") != args.end()) {
     out << usage << "\nPrints the shell's completion script for the commands loaded now.\n";
     return kExitOk;
   }

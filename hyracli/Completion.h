@@ -23,7 +23,8 @@ bool WriteCompletionScript(const std::string& shell,
                            std::ostream& out);
 
 // "hyracli completion SHELL": args are the words after "completion". Answers
-// the exit status; a missing or unknown shell is a usage error.
+// the exit status; "--help" among them prints the usage, a missing or
+// unknown shell is a usage error.
 int RunCompletion(const std::vector<std::string>& args,
                   const boost::shared_ptr<Fendle::AutoCli::NamespaceNode>& root, std::ostream& out,
                   std::ostream& err);

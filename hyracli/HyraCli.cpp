@@ -307,8 +307,9 @@ int Main(const std::vector<std::string>& args, std::ostream& out, std::ostream& 
   // The tool's own word, unless a plug-in took that name.
   if (!options.words.empty() && options.words.front() == kCompletionWord &&
       !root->HasNamespaceNode(kCompletionWord)) {
-    return RunCompletion(std::vector<std::string>(options.words.begin() + 1, options.words.end()),
-                         root, out, err);
+    std::vector<std::string> rest(options.words.begin() + 1, options.words.end());
+    if (options.help) rest.push_back("--help");
+    return RunCompletion(rest, root, out, err);
   }
   return Dispatch(options, root, out, err);
 }

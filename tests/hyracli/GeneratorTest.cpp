@@ -121,6 +121,9 @@ TEST_F(GeneratorTest, CompletionWordNeedsExactlyOneKnownShell) {
   EXPECT_EQ(Hyracli::RunCompletion({"csh"}, root_, out, err), Hyracli::kExitUsage);
   EXPECT_EQ(out.str(), "");
   EXPECT_EQ(err.str().substr(0, 46), "hyracli: completion takes one shell: bash|zsh|");
+  EXPECT_EQ(Hyracli::RunCompletion({"bash", "--help"}, root_, out, err), Hyracli::kExitOk);
+  EXPECT_EQ(out.str().substr(0, 40), "Usage: hyracli completion bash|zsh|fish\n");
+  out.str("");
   EXPECT_EQ(Hyracli::RunCompletion({"zsh"}, root_, out, err), Hyracli::kExitOk);
   EXPECT_EQ(out.str().substr(0, 17), "#compdef hyracli\n");
 }
