@@ -9,7 +9,9 @@
 #include "OskCtl/Lib.h"
 #include "fendle/ArgumentParser.h"
 #include "fendle/Formatter.h"
+#include "hyracli/Completion.h"
 #include "hyracli/PluginLoader.h"
+#include "hyracli/ToolOptionList.h"
 
 namespace Hyracli {
 
@@ -99,7 +101,9 @@ void ListNamespace(const NamespaceNode& node, std::ostream& out) {
     out << "\nGlobal options:\n"
            "  --formatter NAME  render the result as simple, table or json\n"
            "  --plugin-dir DIR  load the plug-ins from DIR\n"
-           "  --help            show help for the words that follow\n";
+           "  --help            show help for the words that follow\n"
+           "\nShell completion:\n"
+           "  completion bash|zsh|fish  print the shell's completion script\n";
   }
   ListChildren(node, NodeType::Namespace, "Namespaces", out);
   ListChildren(node, NodeType::Command, "Commands", out);
@@ -299,6 +303,13 @@ int Main(const std::vector<std::string>& args, std::ostream& out, std::ostream& 
   } catch (const PluginError& e) {
     WriteMessage(err, std::string(kTool) + ": " + e.what());
     return kExitPlugin;
+  }
+  // The tool's own word, unless a plug-in took that name.
+  if (!options.words.empty() && options.words.front() == kCompletionWord &&
+      !root->HasNamespaceNode(kCompletionWord)) {
+    std::vector<std::string> rest(options.words.begin() + 1, options.words.end());
+    if (options.help) rest.push_back("--help");
+    return RunCompletion(rest, root, out, err);
   }
   return Dispatch(options, root, out, err);
 }

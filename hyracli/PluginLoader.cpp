@@ -96,6 +96,8 @@ void PluginLoader::Load(const std::string& path,
   Register(reinterpret_cast<RegisterEntry>(symbol), path, root);
 }
 
+const char* PluginSubdirectory() { return HYRACLI_PLUGIN_SUBDIR; }
+
 std::string PluginDirectory(const std::string& given) {
   if (!given.empty()) return given;
   const char* environment = std::getenv("HYRACLI_PLUGIN_DIR");
@@ -103,7 +105,8 @@ std::string PluginDirectory(const std::string& given) {
   std::error_code error;
   std::filesystem::path self = std::filesystem::read_symlink("/proc/self/exe", error);
   if (error) throw PluginError("Cannot find the directory of hyracli: " + error.message());
-  return self.parent_path().string();
+  // Relative to the tool, so a tree installed under any prefix, or moved, still works.
+  return (self.parent_path() / PluginSubdirectory()).lexically_normal().string();
 }
 
 }  // namespace Hyracli

@@ -48,7 +48,11 @@ class PluginLoader {
 };
 
 // The plug-in directory: given when not empty, else $HYRACLI_PLUGIN_DIR when
-// set and not empty, else the directory of the running executable.
+// set and not empty, else ../lib/hyracli/plugins from the running executable's
+// directory (the same in the build tree and in an installed one).
 std::string PluginDirectory(const std::string& given);
+
+// The default plug-in directory relative to the executable's ("../lib/hyracli/plugins").
+const char* PluginSubdirectory();
 
 }  // namespace Hyracli

@@ -1,0 +1,17 @@
+#include "hyracli/ToolOptionList.h"
+
+namespace Hyracli {
+
+const char kCompletionWord[] = "completion";
+
+const std::vector<ToolOption>& ToolOptionList() {
+  // Kept in step with ParseGlobalOptions, which reads the same names.
+  static const std::vector<ToolOption> kOptions = {
+      {"formatter", "", ToolOptionValue::Formatter, "render the result with the named formatter"},
+      {"plugin-dir", "", ToolOptionValue::Directory, "load the plug-ins from this directory"},
+      {"help", "", ToolOptionValue::None, "show help for the words that follow"},
+  };
+  return kOptions;
+}
+
+}  // namespace Hyracli
