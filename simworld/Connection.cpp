@@ -90,11 +90,6 @@ struct StatementCache {
   }
 };
 
-StatementCache& TheCache() {
-  static StatementCache cache;
-  return cache;
-}
-
 // The connection of this process; closed when the process ends.
 class Holder {
  public:
@@ -107,6 +102,10 @@ class Holder {
     Open(path, check);
     return {db_, true};
   }
+
+  // The statements of the connection, dropped before it closes (a member, so
+  // that it lives exactly as long as the connection, at exit too).
+  StatementCache cache;
 
  private:
   void Open(const std::string& path, void (*check)(sqlite3*)) {
@@ -142,12 +141,12 @@ class Holder {
     db_ = db;
     path_ = path;
     identity_ = IdentityOf(path);
-    TheCache().db = db;
+    cache.db = db;
   }
 
   void Close() {
     // Cached statements would keep the closed connection alive.
-    if (TheCache().db == db_) TheCache().Drop();
+    cache.Drop();
     if (db_ != nullptr) sqlite3_close_v2(db_);
     db_ = nullptr;
     path_.clear();
@@ -168,6 +167,8 @@ Holder& TheHolder() {
   static Holder holder;
   return holder;
 }
+
+StatementCache& TheCache() { return TheHolder().cache; }
 
 }  // namespace
 
