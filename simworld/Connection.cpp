@@ -134,6 +134,10 @@ class Holder {
       check(db);
       ExecPatiently(db, "PRAGMA journal_mode=WAL");
       ExecPatiently(db, "PRAGMA synchronous=NORMAL");
+      // A short-lived process (every hyracli run) would otherwise copy the
+      // log into the database, sync it and delete the log as it closes; the
+      // log stays for the next process, and checkpoints happen as it grows.
+      sqlite3_db_config(db, SQLITE_DBCONFIG_NO_CKPT_ON_CLOSE, 1, nullptr);
     } catch (const WorldError& e) {
       sqlite3_close_v2(db);
       throw WorldError("cannot use the world database " + path + ": " + e.what());

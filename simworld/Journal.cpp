@@ -41,7 +41,8 @@ void RecordCall(sqlite3* db, const std::string& operation, const std::vector<std
       .Bind(3, std::string(outcome))
       .Bind(4, CutText(message))
       .Run();
-  // Sequence numbers only grow, so the entries to drop are a range of the key.
+  // Only the oldest entries are ever dropped, so a new entry's number is one
+  // above the last one's, and the entries to drop are a range of the key.
   Statement(db, "DELETE FROM journal WHERE seq <= ?")
       .Bind(1, int64_t{sqlite3_last_insert_rowid(db)} - kJournalLimit)
       .Run();

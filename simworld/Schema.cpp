@@ -70,7 +70,7 @@ CREATE INDEX mount_array_by_array ON mount_array(array_id, mount_pos);
 CREATE TABLE host(kiro_context TEXT);
 CREATE TABLE failure(operation TEXT PRIMARY KEY, message TEXT, after INTEGER,
   times INTEGER, answer_null INTEGER);
-CREATE TABLE journal(seq INTEGER PRIMARY KEY AUTOINCREMENT, operation TEXT, args TEXT,
+CREATE TABLE journal(seq INTEGER PRIMARY KEY, operation TEXT, args TEXT,
   outcome TEXT, message TEXT);
 )sql";
 

@@ -58,7 +58,7 @@ std::vector<std::pair<std::string, FailureSpec> > ArmedFailures();
 // host's own refusal, message saying why), "failed" (an armed failure,
 // message being its text) or "nothing" (an armed failure answering nothing).
 struct JournalEntry {
-  int64_t seq = 0;  // grows with every call, across processes
+  int64_t seq = 0;  // grows with every call, across processes; 1 again after a clear
   std::string operation;
   std::vector<std::string> args;  // each cut to about 200 bytes
   std::string outcome;
