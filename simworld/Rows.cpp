@@ -4,6 +4,7 @@
 
 #include "Connection.h"
 #include "ContainerId.h"
+#include "Schema.h"
 #include "World.h"
 
 namespace HyraSim {
@@ -201,18 +202,7 @@ std::optional<StorageArray> FindArray(sqlite3* db, const std::string& id) {
                      " configured FROM endpoint WHERE array_pos = ? ORDER BY pos");
   endpoint.Bind(1, arrayPos);
   while (endpoint.Step()) {
-    ProtocolEndpoint pe;
-    pe.localUid = endpoint.Text(1);
-    const int64_t type = endpoint.Int(2);
-    if (type < int64_t(EndpointType::kScsi) || type > int64_t(EndpointType::kNfs4x)) {
-      throw WorldError("the world database is inconsistent (table endpoint)");
-    }
-    pe.type = static_cast<EndpointType>(type);
-    pe.lunId = endpoint.Text(3);
-    pe.ipAddress = endpoint.Text(4);
-    pe.serverMount = endpoint.Text(5);
-    pe.accessible = endpoint.Int(6) != 0;
-    pe.configured = endpoint.Int(7) != 0;
+    ProtocolEndpoint pe = EndpointFrom(endpoint);
     endpointAt[endpoint.Int(0)] = array.endpoints.size();
     array.endpoints.push_back(std::move(pe));
   }

@@ -195,18 +195,7 @@ void LoadArrays(sqlite3* db, std::vector<StorageArray>& arrays) {
                      "SELECT array_pos, local_uid, type, lun_id, ip_address, server_mount,"
                      " accessible, configured, pos FROM endpoint ORDER BY array_pos, pos");
   while (endpoint.Step()) {
-    ProtocolEndpoint pe;
-    pe.localUid = endpoint.Text(1);
-    const int64_t type = endpoint.Int(2);
-    if (type < int64_t(EndpointType::kScsi) || type > int64_t(EndpointType::kNfs4x)) {
-      throw WorldError("the world database is inconsistent (table endpoint)");
-    }
-    pe.type = static_cast<EndpointType>(type);
-    pe.lunId = endpoint.Text(3);
-    pe.ipAddress = endpoint.Text(4);
-    pe.serverMount = endpoint.Text(5);
-    pe.accessible = endpoint.Int(6) != 0;
-    pe.configured = endpoint.Int(7) != 0;
+    ProtocolEndpoint pe = EndpointFrom(endpoint);
     auto& endpoints = arrays[arrayAt.Of(endpoint.Int(0), "endpoint")].endpoints;
     endpointAt.Add({endpoint.Int(0), endpoint.Int(8)}, endpoints.size());
     endpoints.push_back(std::move(pe));
@@ -405,6 +394,22 @@ int64_t StoredLayout(sqlite3* db) {
 }
 
 }  // namespace
+
+ProtocolEndpoint EndpointFrom(const Statement& row) {
+  ProtocolEndpoint pe;
+  pe.localUid = row.Text(1);
+  const int64_t type = row.Int(2);
+  if (type < int64_t(EndpointType::kScsi) || type > int64_t(EndpointType::kNfs4x)) {
+    throw WorldError("the world database is inconsistent (table endpoint)");
+  }
+  pe.type = static_cast<EndpointType>(type);
+  pe.lunId = row.Text(3);
+  pe.ipAddress = row.Text(4);
+  pe.serverMount = row.Text(5);
+  pe.accessible = row.Int(6) != 0;
+  pe.configured = row.Int(7) != 0;
+  return pe;
+}
 
 void RefuseForeignDatabase(sqlite3* db) {
   if (StoredLayout(db) != kLayoutVersion) RequireWorldOrEmpty(db);

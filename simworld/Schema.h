@@ -5,6 +5,7 @@
 
 #include <sqlite3.h>
 
+#include "Connection.h"
 #include "Model.h"
 
 namespace HyraSim {
@@ -19,6 +20,10 @@ void RefuseForeignDatabase(sqlite3* db);
 bool HasWorld(sqlite3* db);
 // Drops whatever world tables there are and creates empty ones.
 void CreateSchema(sqlite3* db);
+
+// The endpoint of a row of the endpoint table whose columns 1 to 7 are
+// local_uid, type, lun_id, ip_address, server_mount, accessible, configured.
+ProtocolEndpoint EndpointFrom(const Statement& row);
 
 // The whole world, for the operations that show or export it.
 WorldState LoadWorld(sqlite3* db);
