@@ -32,6 +32,10 @@ Commands:
                           with --null answer nothing without an error
   fail --clear            disarm every operation
   fail --list             list the operations that can be armed
+  journal [--json]        print the latest host calls (at most 10,000), oldest
+                          first: operation, arguments and outcome (passed,
+                          refused, failed or nothing)
+  journal --clear         empty the journal
   help                    print this text
 )";
 
@@ -141,11 +145,25 @@ int Fail(const Args& args) {
   return 0;
 }
 
+int Journal(const Args& args) {
+  const bool json = args.size() == 1 && args[0] == "--json";
+  const bool clear = args.size() == 1 && args[0] == "--clear";
+  Expect(args.empty() || json || clear, "journal takes only --json or --clear");
+  if (clear) {
+    HyraSim::ClearJournal();
+    std::cout << "The journal is empty.\n";
+    return 0;
+  }
+  HyraSim::PrintJournal(std::cout, HyraSim::ReadJournal(), json);
+  return 0;
+}
+
 int Run(const std::string& command, const Args& args) {
   if (command == "init") return Init(args);
   if (command == "show") return Show(args);
   if (command == "daemon") return Daemon(args);
   if (command == "fail") return Fail(args);
+  if (command == "journal") return Journal(args);
   if (command == "help" || command == "--help" || command == "-h") {
     std::cout << kUsage;
     return 0;

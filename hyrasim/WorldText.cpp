@@ -1,5 +1,7 @@
 #include "WorldText.h"
 
+#include <nlohmann/json.hpp>
+
 namespace HyraSim {
 namespace {
 
@@ -115,6 +117,32 @@ void PrintWorld(std::ostream& out, const std::string& path, const WorldState& wo
     out << "  " << operation << ": " << spec.after << " to pass, then " << spec.times
         << (spec.null ? " to answer nothing" : " to fail with " + Quoted(spec.message)) << "\n";
   }
+}
+
+void PrintJournal(std::ostream& out, const std::vector<JournalEntry>& journal, bool json) {
+  if (!json) {
+    for (const JournalEntry& e : journal) {
+      std::string args;
+      for (const std::string& arg : e.args) args += (args.empty() ? "" : ", ") + Quoted(arg);
+      out << e.seq << " " << e.operation << " [" << args << "] " << e.outcome
+          << (e.message.empty() ? "" : ": " + e.message) << "\n";
+    }
+    return;
+  }
+  // Bytes that are not UTF-8 (the host takes any text) become replacement
+  // characters rather than failing the listing.
+  const auto replace = nlohmann::ordered_json::error_handler_t::replace;
+  out << "[";
+  for (size_t i = 0; i < journal.size(); ++i) {
+    const JournalEntry& e = journal[i];
+    const nlohmann::ordered_json entry = {{"seq", e.seq},
+                                          {"operation", e.operation},
+                                          {"args", e.args},
+                                          {"outcome", e.outcome},
+                                          {"message", e.message}};
+    out << (i == 0 ? "\n  " : ",\n  ") << entry.dump(-1, ' ', false, replace);
+  }
+  out << (journal.empty() ? "]\n" : "\n]\n");
 }
 
 }  // namespace HyraSim

@@ -1,8 +1,8 @@
 #include "StorageContainerLoad.h"
 
-#include <algorithm>
 #include <memory>
 #include <sstream>
+#include <unordered_set>
 
 #include "HostCtl/Lib.h"
 #include "HostCtl/Storage.h"
@@ -196,8 +196,10 @@ void StorageContainerLoad::ExecuteInternal(
   try {
     // Taken once: a container mounted below is not looked up again.
     const TarnFileSystemList mounted = TakeTarnFileSystems(storageInfo);
-    std::vector<std::string> mountedNames;
-    for (const auto& system : mounted) mountedNames.push_back(system->GetContainerName());
+    // A set, so that each exported container is looked up in constant time.
+    std::unordered_set<std::string> mountedNames;
+    mountedNames.reserve(mounted.size());
+    for (const auto& system : mounted) mountedNames.insert(system->GetContainerName());
 
     const boost::shared_ptr<MetaList> rows = MetaList::New(MetaType::Struct, GetOutputStructure());
     // A success without a result exports nothing.
@@ -209,9 +211,7 @@ void StorageContainerLoad::ExecuteInternal(
       const std::string name = TextOf(container->containerName);
       std::string id = TextOf(container->containerId);
       const std::vector<std::string> arrayIds = ReadArrayIds(*container);
-      if (std::find(mountedNames.begin(), mountedNames.end(), name) != mountedNames.end()) {
-        continue;
-      }
+      if (mountedNames.count(name) != 0) continue;
 
       const std::unique_ptr<HostCtl::Storage::TarnFileSystem> system(
           storageInfo.AddTarnFileSystem(name, id, arrayIds, true));

@@ -20,21 +20,21 @@ void ThrowHostError(const std::string& text) {
   throw HostCtl::Lib::HostCtlException(text, HostCtl::Lib::KelmMessage());
 }
 
-bool RunHostOperation(const char* operation, HyraSim::Access access,
-                      const std::function<unsigned(HyraSim::WorldState&)>& body) {
+bool RunHostOperation(const char* operation, HyraSim::Access access, const HyraSim::CallArgs& args,
+                      const std::function<void(sqlite3*)>& body) {
   HyraSim::Injection injection;
   try {
-    injection = HyraSim::RunOperation(operation, access, body);
+    injection = HyraSim::RunOperation(operation, access, args, body);
   } catch (const HyraSim::WorldError& e) {
     ThrowHostError(std::string("The host cannot reach its storage state: ") + e.what());
   }
   return Proceed(injection);
 }
 
-bool CountHostCall(const char* operation) {
+bool CountHostCall(const char* operation, const HyraSim::CallArgs& args) {
   HyraSim::Injection injection;
   try {
-    injection = HyraSim::CountCall(operation);
+    injection = HyraSim::CountCall(operation, args);
   } catch (const HyraSim::WorldError& e) {
     ThrowHostError(std::string("The host cannot reach its storage state: ") + e.what());
   }

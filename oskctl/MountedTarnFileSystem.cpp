@@ -4,6 +4,7 @@
 
 #include "ContainerId.h"
 #include "HostOperation.h"
+#include "Rows.h"
 
 namespace OskCtl {
 namespace Storage {
@@ -12,7 +13,6 @@ namespace {
 using HyraSim::Access;
 using HyraSim::Container;
 using HyraSim::Tarn;
-using HyraSim::WorldState;
 
 // A random (version 4) UUID in lower case.
 std::string NewUuid() {
@@ -39,46 +39,49 @@ MountedTarnFileSystem::MountedTarnFileSystem(const HyraSim::Mount& mount)
     : name_(mount.name), id_(mount.id) {}
 
 std::string MountedTarnFileSystem::GetContainerName() const {
-  return CountHostCall("GetContainerName") ? name_ : std::string();
+  return CountHostCall("GetContainerName", {name_}) ? name_ : std::string();
 }
 
 std::string MountedTarnFileSystem::GetContainerId() const {
-  return CountHostCall("GetContainerId") ? id_ : std::string();
+  return CountHostCall("GetContainerId", {name_}) ? id_ : std::string();
 }
 
 std::string MountedTarnFileSystem::GetContainerIdText() const {
-  return CountHostCall("GetContainerIdText") ? HyraSim::ContainerIdText(id_) : std::string();
+  return CountHostCall("GetContainerIdText", {name_}) ? HyraSim::ContainerIdText(id_)
+                                                      : std::string();
 }
 
 bool MountedTarnFileSystem::MatchesContainerId(const std::string& id) const {
-  return CountHostCall("MatchesContainerId") && HyraSim::SameContainerId(id_, id);
+  return CountHostCall("MatchesContainerId", {name_, id}) && HyraSim::SameContainerId(id_, id);
 }
 
 std::vector<HostCtl::Storage::TarnAccessibilityType> MountedTarnFileSystem::CheckTarnAccessibility(
     const std::vector<std::string>& tarnIds) {
   std::vector<HostCtl::Storage::TarnAccessibilityType> states;
-  RunHostOperation("CheckTarnAccessibility", Access::kRead, [&](WorldState& w) {
-    Container* container = w.ContainerMatching(id_);
-    for (const std::string& id : tarnIds) {
-      const Tarn* tarn = container != nullptr ? HyraSim::FindTarn(*container, id) : nullptr;
-      // A world may hold any 32-bit state; the enumeration's fixed type keeps it.
-      states.push_back(tarn != nullptr
-                           ? static_cast<HostCtl::Storage::TarnAccessibilityType>(tarn->accessibility)
-                           : HostCtl::Storage::TARN_NON_EXISTENT);
-    }
-    return 0u;
-  });
+  RunHostOperation(
+      "CheckTarnAccessibility", Access::kRead, {name_, HyraSim::JoinedArg(tarnIds)},
+      [&](sqlite3* db) {
+        const auto container = HyraSim::FindContainerOf(db, id_);
+        states.reserve(tarnIds.size());
+        for (const std::string& id : tarnIds) {
+          const auto tarn = container ? HyraSim::FindTarnIn(db, container->pos, id) : std::nullopt;
+          // A world may hold any 32-bit state; the enumeration's fixed type keeps it.
+          states.push_back(
+              tarn ? static_cast<HostCtl::Storage::TarnAccessibilityType>(tarn->tarn.accessibility)
+                   : HostCtl::Storage::TARN_NON_EXISTENT);
+        }
+      });
   return states;  // empty when the operation is armed to answer nothing
 }
 
-Container& MountedTarnFileSystem::DaemonContainer(WorldState& world) const {
-  const HyraSim::Mount* mount = world.FindMount(name_);
-  if (mount == nullptr || mount->id != id_) {
+HyraSim::ContainerRow MountedTarnFileSystem::DaemonContainer(sqlite3* db) const {
+  const auto mount = HyraSim::FindMountNamed(db, name_);
+  if (!mount || mount->id != id_) {
     ThrowHostError("The container file system " + name_ + " is no longer mounted");
   }
   const auto normalId = HyraSim::NormalContainerId(id_);
-  Container* container = normalId ? world.DaemonContainer(*normalId) : nullptr;
-  if (container == nullptr) {
+  auto container = normalId ? HyraSim::FindExportedContainer(db, *normalId) : std::nullopt;
+  if (!container) {
     ThrowHostError("Tarnd does not know the container " + id_ + " mounted as " + name_);
   }
   return *container;
@@ -89,77 +92,84 @@ void MountedTarnFileSystem::CreateConfigTarn(const std::string& name, const std:
                                              std::string& createdPath,
                                              const std::string& /*reserved*/, bool /*priority*/) {
   std::string path;
-  const bool ran = RunHostOperation("CreateConfigTarn", Access::kWrite, [&](WorldState& w) {
-    Container& container = DaemonContainer(w);
-    if (!IsValidConfigTarnName(name)) {
-      ThrowHostError("\"" + name + "\" cannot be the directory name of a config-tarn");
-    }
-    if (HyraSim::FindConfigTarn(container, name) != nullptr) {
-      ThrowHostError("A config-tarn named " + name + " already exists in " + container.name);
-    }
-    if (sizeMB < 0) ThrowHostError("The size of a config-tarn cannot be negative");
-    if (sizeMB > container.maxTarnSizeMB) {
-      ThrowHostError("The size " + std::to_string(sizeMB) + " MB is above the largest tarn size " +
-                     std::to_string(container.maxTarnSizeMB) + " MB of " + container.name);
-    }
-    Tarn tarn;
-    do {
-      tarn.uuid = NewUuid();
-    } while (HyraSim::FindTarn(container, tarn.uuid) != nullptr);
-    tarn.logicalSizeMB = sizeMB;
-    tarn.unsharedSizeMB = 0;
-    tarn.configTarn = HyraSim::ConfigTarn{name, policy, vmUuid, false};
-    container.tarns.push_back(tarn);
-    path = HyraSim::MountPath(name_) + "/" + name;
-    return unsigned{HyraSim::kSectionContainers};
-  });
+  const bool ran = RunHostOperation(
+      "CreateConfigTarn", Access::kWrite, {name_, name, policy, std::to_string(sizeMB), vmUuid},
+      [&](sqlite3* db) {
+        const HyraSim::ContainerRow row = DaemonContainer(db);
+        const Container& container = row.container;
+        if (!IsValidConfigTarnName(name)) {
+          ThrowHostError("\"" + name + "\" cannot be the directory name of a config-tarn");
+        }
+        if (HyraSim::FindConfigTarnIn(db, row.pos, name)) {
+          ThrowHostError("A config-tarn named " + name + " already exists in " + container.name);
+        }
+        if (sizeMB < 0) ThrowHostError("The size of a config-tarn cannot be negative");
+        if (sizeMB > container.maxTarnSizeMB) {
+          ThrowHostError("The size " + std::to_string(sizeMB) +
+                         " MB is above the largest tarn size " +
+                         std::to_string(container.maxTarnSizeMB) + " MB of " + container.name);
+        }
+        Tarn tarn;
+        do {
+          tarn.uuid = NewUuid();
+        } while (HyraSim::FindTarnIn(db, row.pos, tarn.uuid));
+        tarn.logicalSizeMB = sizeMB;
+        tarn.unsharedSizeMB = 0;
+        tarn.configTarn = HyraSim::ConfigTarn{name, policy, vmUuid, false};
+        HyraSim::AddTarn(db, row.pos, tarn);
+        path = HyraSim::MountPath(name_) + "/" + name;
+      });
   if (ran) createdPath = path;
 }
 
-void MountedTarnFileSystem::ActOnConfigTarn(const char* operation, const std::string& name,
-                                            const std::string& uuid,
-                                            const std::function<void(Container&, size_t)>& act) {
-  RunHostOperation(operation, Access::kWrite, [&](WorldState& w) {
-    Container& container = DaemonContainer(w);
+void MountedTarnFileSystem::ActOnConfigTarn(
+    const char* operation, const std::string& name, const std::string& uuid,
+    const std::function<void(sqlite3*, int64_t, const HyraSim::TarnRow&)>& act) {
+  RunHostOperation(operation, Access::kWrite, {name_, name, uuid}, [&](sqlite3* db) {
+    const HyraSim::ContainerRow container = DaemonContainer(db);
     if (name.empty() && uuid.empty()) ThrowHostError("Either a config-tarn name or UUID is needed");
-    const Tarn* tarn = uuid.empty() ? HyraSim::FindConfigTarn(container, name)
-                                    : HyraSim::FindTarn(container, uuid);
-    if (tarn == nullptr) {
-      ThrowHostError(uuid.empty() ? "No config-tarn named " + name + " in " + container.name
-                                  : "No tarn with UUID " + uuid + " in " + container.name);
+    const auto tarn = uuid.empty() ? HyraSim::FindConfigTarnIn(db, container.pos, name)
+                                   : HyraSim::FindTarnIn(db, container.pos, uuid);
+    if (!tarn) {
+      ThrowHostError(uuid.empty()
+                         ? "No config-tarn named " + name + " in " + container.container.name
+                         : "No tarn with UUID " + uuid + " in " + container.container.name);
     }
-    if (!tarn->configTarn) ThrowHostError("The tarn " + tarn->uuid + " is not a config-tarn");
-    act(container, static_cast<size_t>(tarn - container.tarns.data()));
-    return unsigned{HyraSim::kSectionContainers};
+    if (!tarn->tarn.configTarn)
+      ThrowHostError("The tarn " + tarn->tarn.uuid + " is not a config-tarn");
+    act(db, container.pos, *tarn);
   });
 }
 
 void MountedTarnFileSystem::MountConfigTarn(const std::string& name, const std::string& uuid,
                                             const std::string& /*reserved*/, bool /*priority*/) {
-  ActOnConfigTarn("MountConfigTarn", name, uuid, [](Container& container, size_t index) {
-    HyraSim::ConfigTarn& configTarn = *container.tarns[index].configTarn;
-    if (configTarn.mounted)
-      ThrowHostError("The config-tarn " + configTarn.name + " is already mounted");
-    configTarn.mounted = true;
-  });
+  ActOnConfigTarn("MountConfigTarn", name, uuid,
+                  [](sqlite3* db, int64_t containerPos, const HyraSim::TarnRow& tarn) {
+                    const HyraSim::ConfigTarn& configTarn = *tarn.tarn.configTarn;
+                    if (configTarn.mounted)
+                      ThrowHostError("The config-tarn " + configTarn.name + " is already mounted");
+                    HyraSim::SetConfigTarnMounted(db, containerPos, tarn.pos, true);
+                  });
 }
 
 void MountedTarnFileSystem::UnmountConfigTarn(const std::string& name, const std::string& uuid,
                                               const std::string& /*reserved*/, bool /*priority*/) {
-  ActOnConfigTarn("UnmountConfigTarn", name, uuid, [](Container& container, size_t index) {
-    HyraSim::ConfigTarn& configTarn = *container.tarns[index].configTarn;
-    if (!configTarn.mounted)
-      ThrowHostError("The config-tarn " + configTarn.name + " is not mounted");
-    configTarn.mounted = false;
-  });
+  ActOnConfigTarn("UnmountConfigTarn", name, uuid,
+                  [](sqlite3* db, int64_t containerPos, const HyraSim::TarnRow& tarn) {
+                    const HyraSim::ConfigTarn& configTarn = *tarn.tarn.configTarn;
+                    if (!configTarn.mounted)
+                      ThrowHostError("The config-tarn " + configTarn.name + " is not mounted");
+                    HyraSim::SetConfigTarnMounted(db, containerPos, tarn.pos, false);
+                  });
 }
 
 void MountedTarnFileSystem::RemoveConfigTarn(const std::string& name, const std::string& uuid,
                                              const std::string& /*reserved*/, bool /*priority*/) {
   // Removing unmounts first, so a mounted config-tarn goes as well.
-  ActOnConfigTarn("RemoveConfigTarn", name, uuid, [](Container& container, size_t index) {
-    container.tarns.erase(container.tarns.begin() + static_cast<std::ptrdiff_t>(index));
-  });
+  ActOnConfigTarn("RemoveConfigTarn", name, uuid,
+                  [](sqlite3* db, int64_t containerPos, const HyraSim::TarnRow& tarn) {
+                    HyraSim::RemoveTarn(db, containerPos, tarn.pos);
+                  });
 }
 
 }  // namespace Storage

@@ -3,12 +3,15 @@
 // that id.
 #pragma once
 
+#include <sqlite3.h>
+
 #include <functional>
 #include <string>
 #include <vector>
 
 #include "Model.h"
 #include "OskCtl/Storage.h"
+#include "Rows.h"
 
 namespace OskCtl {
 namespace Storage {
@@ -37,11 +40,11 @@ class MountedTarnFileSystem : public TarnFileSystemImpl {
  private:
   // The daemon's container behind this file system; throws when the file
   // system is no longer mounted or the daemon does not know the container.
-  HyraSim::Container& DaemonContainer(HyraSim::WorldState& world) const;
-  // Finds the config-tarn named by uuid (when given) or name and hands it to
-  // act, all as one operation.
+  HyraSim::ContainerRow DaemonContainer(sqlite3* db) const;
+  // Finds the config-tarn named by uuid (when given) or name and hands it,
+  // with its container's position, to act, all as one operation.
   void ActOnConfigTarn(const char* operation, const std::string& name, const std::string& uuid,
-                       const std::function<void(HyraSim::Container&, size_t)>& act);
+                       const std::function<void(sqlite3*, int64_t, const HyraSim::TarnRow&)>& act);
 
   std::string name_;
   std::string id_;

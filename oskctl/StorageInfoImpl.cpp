@@ -1,16 +1,14 @@
-#include <algorithm>
-
 #include "ContainerId.h"
 #include "HostOperation.h"
 #include "MountedTarnFileSystem.h"
 #include "OskCtl/Storage.h"
+#include "Rows.h"
 
 namespace OskCtl {
 namespace Storage {
 namespace {
 
 using HyraSim::Access;
-using HyraSim::WorldState;
 
 const char kVolumesDirectory[] = "/hyra/volumes/";
 
@@ -46,6 +44,8 @@ std::string NameInPath(std::string path) {
   return HyraSim::IsValidMountName(name) ? name : std::string();
 }
 
+std::string Flag(bool value) { return value ? "true" : "false"; }
+
 }  // namespace
 
 StorageInfoImpl::StorageInfoImpl() = default;
@@ -54,64 +54,72 @@ StorageInfoImpl::~StorageInfoImpl() = default;
 
 std::vector<HostCtl::Storage::TarnFileSystem*> StorageInfoImpl::GetTarnFileSystems() {
   std::vector<HyraSim::Mount> mounts;
-  if (!RunHostOperation("GetTarnFileSystems", Access::kRead, [&](WorldState& w) {
-        mounts = w.mounted;
-        return 0u;
-      })) {
+  if (!RunHostOperation("GetTarnFileSystems", Access::kRead, {},
+                        [&](sqlite3* db) { mounts = HyraSim::ReadMounts(db); })) {
     return {};
   }
   std::vector<std::unique_ptr<HostCtl::Storage::TarnFileSystem> > owned;
+  owned.reserve(mounts.size());
   for (const auto& mount : mounts) owned.push_back(std::make_unique<MountedTarnFileSystem>(mount));
   std::vector<HostCtl::Storage::TarnFileSystem*> systems;
+  systems.reserve(owned.size());
   for (auto& system : owned) systems.push_back(system.release());
   return systems;
 }
 
 HostCtl::Storage::TarnFileSystem* StorageInfoImpl::AddTarnFileSystem(
     const std::string& name, std::string& id, const std::vector<std::string>& arrayIds,
-    bool /*persist*/) {
-  const HyraSim::Mount mount{name, id, arrayIds};
-  if (!RunHostOperation("AddTarnFileSystem", Access::kWrite, [&](WorldState& w) {
-        if (!HyraSim::IsValidMountName(name)) {
-          ThrowHostError("Cannot mount a container named \"" + name +
-                         "\": the name cannot be a directory name");
-        }
-        if (w.FindMount(name) != nullptr) {
-          ThrowHostError("A container file system named " + name + " is already mounted at " +
-                         HyraSim::MountPath(name));
-        }
-        w.mounted.push_back(mount);
-        return unsigned{HyraSim::kSectionMounts};
-      })) {
+    bool persist) {
+  HyraSim::Mount mount{name, id, arrayIds};
+  if (!RunHostOperation("AddTarnFileSystem", Access::kWrite,
+                        {name, id, HyraSim::JoinedArg(arrayIds), Flag(persist)}, [&](sqlite3* db) {
+                          if (!HyraSim::IsValidMountName(name)) {
+                            ThrowHostError("Cannot mount a container named \"" + name +
+                                           "\": the name cannot be a directory name");
+                          }
+                          // A mount that could never be removed again (by its normal id) is
+                          // refused.
+                          const auto normalId = HyraSim::NormalContainerId(id);
+                          if (!normalId) {
+                            ThrowHostError("Cannot mount the container " + name + ": \"" + id +
+                                           "\" is not a container id");
+                          }
+                          if (const auto named = HyraSim::FindMountNamed(db, name)) {
+                            // The same container under the same name is already what was
+                            // asked for (another process may have mounted it a moment ago).
+                            if (HyraSim::SameContainerId(named->id, *normalId)) {
+                              mount = *named;
+                              return;
+                            }
+                            ThrowHostError("A container file system named " + name +
+                                           " is already mounted at " + HyraSim::MountPath(name));
+                          }
+                          if (const auto other = HyraSim::FindMountOf(db, *normalId)) {
+                            ThrowHostError("The container " + id + " is already mounted as " +
+                                           other->name + " at " + HyraSim::MountPath(other->name));
+                          }
+                          HyraSim::AddMount(db, mount);
+                        })) {
     return nullptr;
   }
   return new MountedTarnFileSystem(mount);
 }
 
 void StorageInfoImpl::RemoveTarnFileSystem(const std::string& normalizedId) {
-  RunHostOperation("RemoveTarnFileSystem", Access::kWrite, [&](WorldState& w) {
-    const auto removed = std::remove_if(w.mounted.begin(), w.mounted.end(), [&](const auto& m) {
-      return HyraSim::SameContainerId(m.id, normalizedId);
-    });
-    if (removed == w.mounted.end()) {
+  RunHostOperation("RemoveTarnFileSystem", Access::kWrite, {normalizedId}, [&](sqlite3* db) {
+    if (HyraSim::RemoveMountsOf(db, normalizedId) == 0) {
       ThrowHostError("No container file system with id " + normalizedId + " is mounted");
     }
-    w.mounted.erase(removed, w.mounted.end());
-    return unsigned{HyraSim::kSectionMounts};
   });
 }
 
 HostCtl::Storage::TarnFileSystem* StorageInfoImpl::GetTarnFileSystemByPath(
     const std::string& path) {
   std::optional<HyraSim::Mount> found;
-  if (!RunHostOperation("GetTarnFileSystemByPath", Access::kRead,
-                        [&](WorldState& w) {
+  if (!RunHostOperation("GetTarnFileSystemByPath", Access::kRead, {path},
+                        [&](sqlite3* db) {
                           const std::string name = NameInPath(path);
-                          if (const HyraSim::Mount* mount =
-                                  name.empty() ? nullptr : w.FindMount(name)) {
-                            found = *mount;
-                          }
-                          return 0u;
+                          if (!name.empty()) found = HyraSim::FindMountNamed(db, name);
                         }) ||
       !found) {
     return nullptr;
@@ -122,35 +130,34 @@ HostCtl::Storage::TarnFileSystem* StorageInfoImpl::GetTarnFileSystemByPath(
 
 bool StorageInfoImpl::TarnVpExists(const std::string& name) {
   bool exists = false;
-  RunHostOperation("TarnVpExists", Access::kRead, [&](WorldState& w) {
-    exists = w.FindProvider(name) != nullptr;
-    return 0u;
-  });
+  RunHostOperation("TarnVpExists", Access::kRead, {name},
+                   [&](sqlite3* db) { exists = HyraSim::FindProviderNamed(db, name).has_value(); });
   return exists;
 }
 
 void StorageInfoImpl::GetTarnVendorProviders(
     const std::string& name, std::vector<HostCtl::Storage::VendorProviderInfo>& providers) {
   std::vector<HostCtl::Storage::VendorProviderInfo> found;
-  RunHostOperation("GetTarnVendorProviders", Access::kRead, [&](WorldState& w) {
-    if (const HyraSim::Provider* provider = w.FindProvider(name))
+  RunHostOperation("GetTarnVendorProviders", Access::kRead, {name}, [&](sqlite3* db) {
+    if (const auto provider = HyraSim::FindProviderNamed(db, name))
       found.push_back(ToInfo(*provider));
-    return 0u;
   });
   providers.insert(providers.end(), found.begin(), found.end());
 }
 
 void StorageInfoImpl::UpdateTarnVendorProvider(
     const std::vector<HostCtl::Storage::VendorProviderInfo>& providers) {
-  RunHostOperation("UpdateTarnVendorProvider", Access::kWrite, [&](WorldState& w) {
-    for (const auto& info : providers) {
-      if (HyraSim::Provider* existing = w.FindProvider(info.name)) {
-        *existing = FromInfo(info);
-      } else {
-        w.providers.push_back(FromInfo(info));
-      }
+  HyraSim::CallArgs args;
+  for (const auto& info : providers) {
+    std::vector<std::string> arrays;
+    for (const auto& array : info.arrays) {
+      arrays.push_back(array.arrayId + (array.isActive ? " active " : " inactive ") +
+                       std::to_string(array.priority));
     }
-    return unsigned{HyraSim::kSectionProviders};
+    args.push_back(info.name + " " + info.url + " [" + HyraSim::JoinedArg(arrays) + "]");
+  }
+  RunHostOperation("UpdateTarnVendorProvider", Access::kWrite, args, [&](sqlite3* db) {
+    for (const auto& info : providers) HyraSim::StoreProvider(db, FromInfo(info));
   });
 }
 
@@ -158,27 +165,18 @@ void StorageInfoImpl::NotifyTarnProtocolEndpointEvent(const std::string& endpoin
                                                       HostCtl::Storage::ProtocolEndPointEvent event,
                                                       std::vector<std::string>& containers) {
   std::vector<std::string> affected;
-  RunHostOperation("NotifyTarnProtocolEndpointEvent", Access::kWrite, [&](WorldState& w) {
-    if (event != HostCtl::Storage::PE_APD_START && event != HostCtl::Storage::PE_APD_END) {
-      ThrowHostError("Unknown protocol endpoint event " + std::to_string(static_cast<int>(event)));
-    }
-    const HyraSim::StorageArray* owner = nullptr;
-    for (auto& array : w.arrays) {
-      for (auto& pe : array.endpoints) {
-        if (pe.localUid == endpoint) {
-          pe.accessible = event == HostCtl::Storage::PE_APD_END;
-          owner = &array;
+  RunHostOperation(
+      "NotifyTarnProtocolEndpointEvent", Access::kWrite,
+      {endpoint, std::to_string(static_cast<int>(event))}, [&](sqlite3* db) {
+        if (event != HostCtl::Storage::PE_APD_START && event != HostCtl::Storage::PE_APD_END) {
+          ThrowHostError("Unknown protocol endpoint event " +
+                         std::to_string(static_cast<int>(event)));
         }
-      }
-    }
-    if (owner == nullptr) ThrowHostError("No protocol endpoint has the local UID " + endpoint);
-    for (const auto& mount : w.mounted) {
-      if (std::find(mount.arrays.begin(), mount.arrays.end(), owner->id) != mount.arrays.end()) {
-        affected.push_back(mount.name);
-      }
-    }
-    return unsigned{HyraSim::kSectionArrays};
-  });
+        const auto owner =
+            HyraSim::SetEndpointAccessible(db, endpoint, event == HostCtl::Storage::PE_APD_END);
+        if (!owner) ThrowHostError("No protocol endpoint has the local UID " + endpoint);
+        affected = HyraSim::MountsOnArray(db, *owner);
+      });
   containers.insert(containers.end(), affected.begin(), affected.end());
 }
 

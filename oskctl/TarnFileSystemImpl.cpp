@@ -1,6 +1,7 @@
 #include "HostCtl/Storage.h"
 #include "HostOperation.h"
 #include "OskCtl/Storage.h"
+#include "Rows.h"
 
 namespace HostCtl {
 namespace Storage {
@@ -14,28 +15,22 @@ namespace OskCtl {
 namespace Storage {
 
 using HyraSim::Access;
-using HyraSim::WorldState;
 
 void TarnFileSystemImpl::SetKiroContext(const std::string& uuid) {
-  RunHostOperation("SetKiroContext", Access::kWrite, [&](WorldState& w) {
-    w.kiroContext = uuid;
-    return unsigned{HyraSim::kSectionKiro};
-  });
+  RunHostOperation("SetKiroContext", Access::kWrite, {uuid},
+                   [&](sqlite3* db) { HyraSim::StoreKiroContext(db, uuid); });
 }
 
 void TarnFileSystemImpl::ClearKiroContext() {
-  RunHostOperation("ClearKiroContext", Access::kWrite, [](WorldState& w) {
-    w.kiroContext.reset();
-    return unsigned{HyraSim::kSectionKiro};
-  });
+  RunHostOperation("ClearKiroContext", Access::kWrite, {},
+                   [](sqlite3* db) { HyraSim::StoreKiroContext(db, std::nullopt); });
 }
 
 void TarnFileSystemImpl::UnRegisterVendorProvider(const std::string& name) {
-  RunHostOperation("UnRegisterVendorProvider", Access::kWrite, [&](WorldState& w) {
-    const HyraSim::Provider* provider = w.FindProvider(name);
-    if (provider == nullptr) ThrowHostError("No Kiro provider named " + name + " is registered");
-    w.providers.erase(w.providers.begin() + (provider - w.providers.data()));
-    return unsigned{HyraSim::kSectionProviders};
+  RunHostOperation("UnRegisterVendorProvider", Access::kWrite, {name}, [&](sqlite3* db) {
+    if (!HyraSim::RemoveProviderNamed(db, name)) {
+      ThrowHostError("No Kiro provider named " + name + " is registered");
+    }
   });
 }
 

@@ -1,8 +1,10 @@
 #!/usr/bin/env bash
-# Installs the Debian 12 packages the build and the tests need (run as root).
+# Installs the Debian 12 packages the build, the tests and the benchmarks need
+# (run as root).
 set -euo pipefail
 packages=(build-essential cmake libboost-dev libsqlite3-dev nlohmann-json3-dev libgtest-dev libgmock-dev
-  dpkg-dev bash-completion mandoc zsh fish)
+  dpkg-dev bash-completion mandoc zsh fish
+  libbenchmark-dev hyperfine sqlite3 time)
 missing=()
 for p in "${packages[@]}"; do
   dpkg-query -W -f='${Status}' "$p" 2>/dev/null | grep -q "install ok installed" || missing+=("$p")

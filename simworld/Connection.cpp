@@ -10,6 +10,8 @@
 #include <cstdlib>
 #include <cstring>
 #include <thread>
+#include <unordered_map>
+#include <vector>
 
 #include "World.h"
 
@@ -73,6 +75,21 @@ std::optional<FileIdentity> IdentityOf(const std::string& path) {
   return FileIdentity{info.st_dev, info.st_ino};
 }
 
+// Prepared statements of the process's connection that are not in use, by
+// their SQL. Only the holder's connection has a cache.
+struct StatementCache {
+  sqlite3* db = nullptr;
+  std::unordered_map<std::string, std::vector<sqlite3_stmt*> > idle;
+
+  void Drop() {
+    for (auto& entry : idle) {
+      for (sqlite3_stmt* stmt : entry.second) sqlite3_finalize(stmt);
+    }
+    idle.clear();
+    db = nullptr;
+  }
+};
+
 // The connection of this process; closed when the process ends.
 class Holder {
  public:
@@ -85,6 +102,10 @@ class Holder {
     Open(path, check);
     return {db_, true};
   }
+
+  // The statements of the connection, dropped before it closes (a member, so
+  // that it lives exactly as long as the connection, at exit too).
+  StatementCache cache;
 
  private:
   void Open(const std::string& path, void (*check)(sqlite3*)) {
@@ -113,6 +134,10 @@ class Holder {
       check(db);
       ExecPatiently(db, "PRAGMA journal_mode=WAL");
       ExecPatiently(db, "PRAGMA synchronous=NORMAL");
+      // A short-lived process (every hyracli run) would otherwise copy the
+      // log into the database, sync it and delete the log as it closes; the
+      // log stays for the next process, and checkpoints happen as it grows.
+      sqlite3_db_config(db, SQLITE_DBCONFIG_NO_CKPT_ON_CLOSE, 1, nullptr);
     } catch (const WorldError& e) {
       sqlite3_close_v2(db);
       throw WorldError("cannot use the world database " + path + ": " + e.what());
@@ -120,9 +145,12 @@ class Holder {
     db_ = db;
     path_ = path;
     identity_ = IdentityOf(path);
+    cache.db = db;
   }
 
   void Close() {
+    // Cached statements would keep the closed connection alive.
+    cache.Drop();
     if (db_ != nullptr) sqlite3_close_v2(db_);
     db_ = nullptr;
     path_.clear();
@@ -143,6 +171,8 @@ Holder& TheHolder() {
   static Holder holder;
   return holder;
 }
+
+StatementCache& TheCache() { return TheHolder().cache; }
 
 }  // namespace
 
@@ -166,11 +196,34 @@ void Exec(sqlite3* db, const char* sql) {
   if (sqlite3_exec(db, sql, nullptr, nullptr, nullptr) != SQLITE_OK) ThrowSqlError(db, sql);
 }
 
-Statement::Statement(sqlite3* db, const char* sql) : db_(db) {
+Statement::Statement(sqlite3* db, const char* sql) : db_(db), sql_(sql) {
+  StatementCache& cache = TheCache();
+  if (cache.db == db) {
+    const auto found = cache.idle.find(sql_);
+    if (found != cache.idle.end() && !found->second.empty()) {
+      stmt_ = found->second.back();
+      found->second.pop_back();
+      return;
+    }
+  }
   if (sqlite3_prepare_v2(db, sql, -1, &stmt_, nullptr) != SQLITE_OK) ThrowSqlError(db, sql);
 }
 
-Statement::~Statement() { sqlite3_finalize(stmt_); }
+Statement::~Statement() {
+  StatementCache& cache = TheCache();
+  if (stmt_ == nullptr) return;
+  if (cache.db != db_) {
+    sqlite3_finalize(stmt_);
+    return;
+  }
+  sqlite3_reset(stmt_);
+  sqlite3_clear_bindings(stmt_);
+  try {
+    cache.idle[sql_].push_back(stmt_);
+  } catch (...) {
+    sqlite3_finalize(stmt_);
+  }
+}
 
 Statement& Statement::Bind(int index, int64_t value) {
   sqlite3_bind_int64(stmt_, index, value);
@@ -232,6 +285,26 @@ Transaction::~Transaction() {
 void Transaction::Commit() {
   ExecPatiently(db_, "COMMIT");
   open_ = false;
+}
+
+Savepoint::Savepoint(sqlite3* db) : db_(db) {
+  Exec(db, "SAVEPOINT body");
+  open_ = true;
+}
+
+Savepoint::~Savepoint() {
+  if (open_) Undo();
+}
+
+void Savepoint::Keep() {
+  Exec(db_, "RELEASE body");
+  open_ = false;
+}
+
+void Savepoint::Undo() {
+  open_ = false;
+  sqlite3_exec(db_, "ROLLBACK TO body", nullptr, nullptr, nullptr);
+  sqlite3_exec(db_, "RELEASE body", nullptr, nullptr, nullptr);
 }
 
 }  // namespace HyraSim

@@ -30,8 +30,10 @@ OpenedDatabase OpenDatabase(void (*check)(sqlite3*));
 
 void Exec(sqlite3* db, const char* sql);
 
-// One prepared statement, finalised when it goes out of scope. Bind indexes
-// count from 1, column indexes from 0.
+// One prepared statement, borrowed for the scope from the connection's cache
+// of prepared statements (so that an operation run many times parses its SQL
+// once per process) and given back reset. Bind indexes count from 1, column
+// indexes from 0.
 class Statement {
  public:
   Statement(sqlite3* db, const char* sql);
@@ -54,6 +56,7 @@ class Statement {
 
  private:
   sqlite3* db_;
+  std::string sql_;
   sqlite3_stmt* stmt_ = nullptr;
 };
 
@@ -67,6 +70,23 @@ class Transaction {
   Transaction(const Transaction&) = delete;
   Transaction& operator=(const Transaction&) = delete;
   void Commit();
+
+ private:
+  sqlite3* db_;
+  bool open_ = false;
+};
+
+// A nested transaction inside an open one: what it changed is undone by
+// Undo (or when it is left without Keep), while the outer transaction and
+// what it did before stay.
+class Savepoint {
+ public:
+  explicit Savepoint(sqlite3* db);
+  ~Savepoint();
+  Savepoint(const Savepoint&) = delete;
+  Savepoint& operator=(const Savepoint&) = delete;
+  void Keep();
+  void Undo();
 
  private:
   sqlite3* db_;

@@ -60,12 +60,6 @@ std::vector<std::string> ArmableOperations() {
   return std::vector<std::string>(std::begin(kArmable), std::end(kArmable));
 }
 
-bool IsArmed(sqlite3* db, const std::string& operation) {
-  Statement row(db, "SELECT 1 FROM failure WHERE operation = ?");
-  row.Bind(1, operation);
-  return row.Step();
-}
-
 Injection ConsumeCall(sqlite3* db, const std::string& operation) {
   Statement row(db, "SELECT message, after, times, answer_null FROM failure WHERE operation = ?");
   row.Bind(1, operation);

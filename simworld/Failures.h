@@ -21,9 +21,8 @@ struct Injection {
 };
 
 bool IsArmableOperation(const std::string& operation);
-// Whether operation is armed at all; a cheap test made outside a transaction.
-bool IsArmed(sqlite3* db, const std::string& operation);
-// Counts one call of operation against its arming; needs a write transaction.
+// Counts one call of operation against its arming, if it is armed; needs a
+// write transaction.
 Injection ConsumeCall(sqlite3* db, const std::string& operation);
 
 void StoreArming(sqlite3* db, const std::string& operation, const FailureSpec& spec);

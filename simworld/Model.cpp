@@ -3,8 +3,6 @@
 #include <algorithm>
 #include <cctype>
 
-#include "ContainerId.h"
-
 namespace HyraSim {
 
 const StorageArray* WorldState::FindArray(const std::string& id) const {
@@ -21,51 +19,15 @@ Provider* WorldState::FindProvider(const std::string& name) {
   return nullptr;
 }
 
-Mount* WorldState::FindMount(const std::string& name) {
-  for (auto& mount : mounted) {
-    if (mount.name == name) return &mount;
-  }
-  return nullptr;
-}
-
 bool WorldState::IsExported(const Container& container) const {
   return std::any_of(providers.begin(), providers.end(),
                      [&](const Provider& p) { return p.url == container.vpUrl; });
 }
 
-Container* WorldState::DaemonContainer(const std::string& normalId) {
-  for (auto& container : containers) {
-    if (IsExported(container) && ContainerIdText(container.id) == normalId) return &container;
-  }
-  return nullptr;
-}
-
-Container* WorldState::ContainerMatching(const std::string& id) {
-  for (auto& container : containers) {
-    if (SameContainerId(container.id, id)) return &container;
-  }
-  return nullptr;
-}
-
-bool SameUuid(const std::string& a, const std::string& b) {
-  return a.size() == b.size() && std::equal(a.begin(), a.end(), b.begin(), [](char x, char y) {
-           return std::tolower(static_cast<unsigned char>(x)) ==
-                  std::tolower(static_cast<unsigned char>(y));
-         });
-}
-
-Tarn* FindTarn(Container& container, const std::string& uuid) {
-  for (auto& tarn : container.tarns) {
-    if (SameUuid(tarn.uuid, uuid)) return &tarn;
-  }
-  return nullptr;
-}
-
-Tarn* FindConfigTarn(Container& container, const std::string& name) {
-  for (auto& tarn : container.tarns) {
-    if (tarn.configTarn && tarn.configTarn->name == name) return &tarn;
-  }
-  return nullptr;
+std::string UuidKey(const std::string& uuid) {
+  std::string key = uuid;
+  for (char& c : key) c = static_cast<char>(std::tolower(static_cast<unsigned char>(c)));
+  return key;
 }
 
 std::string MountPath(const std::string& containerName) { return "/hyra/volumes/" + containerName; }

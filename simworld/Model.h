@@ -1,5 +1,6 @@
-// The simulated host held in memory while one operation runs: what the daemon
-// knows, what the host has registered and mounted. Lists keep the world's
+// The simulated host as records: the whole world when it is shown, exported or
+// replaced, the rows an operation reads otherwise. What the daemon knows, what
+// the host has registered and mounted. Lists keep the world's
 // order (the scenario's order, later additions at the end).
 #pragma once
 
@@ -119,18 +120,6 @@ struct Mount {
   std::vector<std::string> arrays;
 };
 
-// The parts of the world that are stored separately, so that an operation
-// writes back only what it changed.
-enum Section : unsigned {
-  kSectionDaemon = 1u << 0,
-  kSectionArrays = 1u << 1,
-  kSectionContainers = 1u << 2,
-  kSectionProviders = 1u << 3,
-  kSectionMounts = 1u << 4,
-  kSectionKiro = 1u << 5,
-  kSectionAll = (1u << 6) - 1,
-};
-
 struct WorldState {
   Daemon daemon;
   std::vector<StorageArray> arrays;
@@ -141,21 +130,14 @@ struct WorldState {
 
   const StorageArray* FindArray(const std::string& id) const;
   Provider* FindProvider(const std::string& name);
-  Mount* FindMount(const std::string& name);
   // The daemon learns of a container through a provider registered on the host
   // whose URL is the container's provider URL; only those are exported.
   bool IsExported(const Container& container) const;
-  // The exported container whose id has that normal form, or null.
-  Container* DaemonContainer(const std::string& normalId);
-  // Any container whose id names the same container as id, or null.
-  Container* ContainerMatching(const std::string& id);
 };
 
-// Tarn UUIDs compare without regard to case.
-bool SameUuid(const std::string& a, const std::string& b);
-Tarn* FindTarn(Container& container, const std::string& uuid);
-// The config-tarn of that directory name, or null.
-Tarn* FindConfigTarn(Container& container, const std::string& name);
+// Tarn UUIDs compare without regard to case: two are the same when their keys
+// are.
+std::string UuidKey(const std::string& uuid);
 
 // The mount path of a container file system.
 std::string MountPath(const std::string& containerName);

@@ -5,6 +5,8 @@
 #include <limits>
 #include <nlohmann/json.hpp>
 #include <set>
+#include <string>
+#include <unordered_set>
 
 #include "ContainerId.h"
 #include "Scenario.h"
@@ -313,6 +315,9 @@ void ReadContainers(Record& top, const std::vector<StorageArray>& arrays,
                     std::vector<Container>& containers) {
   UniqueKeys names("container name");
   UniqueKeys ids("container id");
+  // A set, so that a world of many arrays is not scanned once per reference.
+  std::unordered_set<std::string> arrayIdsKnown;
+  for (const StorageArray& a : arrays) arrayIdsKnown.insert(a.id);
   ForEach(top, "containers", [&](Record& r) {
     Container container;
     container.name = r.Text("name");
@@ -328,8 +333,7 @@ void ReadContainers(Record& top, const std::vector<StorageArray>& arrays,
     for (size_t i = 0; i < container.arrays.size(); ++i) {
       const std::string path = Index(r.PathOf("arrays"), i);
       const std::string& id = container.arrays[i];
-      if (std::none_of(arrays.begin(), arrays.end(),
-                       [&](const StorageArray& a) { return a.id == id; })) {
+      if (arrayIdsKnown.count(id) == 0) {
         Refuse(path, "no array has the id \"" + id + "\"");
       }
       arrayIds.Add(id, path);

@@ -1,53 +1,77 @@
 #include "Schema.h"
 
+#include <map>
 #include <string>
+#include <utility>
 
 #include "Connection.h"
+#include "ContainerId.h"
 #include "World.h"
 
 namespace HyraSim {
 namespace {
 
-constexpr int64_t kLayoutVersion = 1;
+// 2: rows found through indexes, positions that may have gaps, the journal.
+constexpr int64_t kLayoutVersion = 2;
 
-// Child rows refer to their parent by its position in the parent list.
+// Child rows refer to their parent by its position, which orders the parent
+// list; a removed row leaves a gap and an added one goes after the last. The
+// *_key columns hold the form a look-up compares: the normal form of a
+// container id (any other text unchanged), a tarn UUID in lower case.
 const char* const kCreateTables = R"sql(
 CREATE TABLE layout(version INTEGER NOT NULL);
 CREATE TABLE daemon(running INTEGER, log_level INTEGER, dump_requests INTEGER,
   unbind_period INTEGER, fault_injection INTEGER, space_efficiency INTEGER);
 CREATE TABLE fault_rule(pos INTEGER PRIMARY KEY, operation TEXT, fault TEXT,
   frequency INTEGER, time INTEGER);
+CREATE INDEX fault_rule_by_key ON fault_rule(operation, fault, pos);
 CREATE TABLE activation(pos INTEGER PRIMARY KEY, array_id TEXT, provider TEXT,
   active INTEGER, active_provider_url TEXT);
+CREATE INDEX activation_by_key ON activation(array_id, provider, pos);
 CREATE TABLE provider_fault(pos INTEGER PRIMARY KEY, provider TEXT, url TEXT, status TEXT);
+CREATE INDEX provider_fault_by_provider ON provider_fault(provider, pos);
 CREATE TABLE provider_fault_array(fault_pos INTEGER, pos INTEGER, array_id TEXT,
   is_active INTEGER, PRIMARY KEY(fault_pos, pos));
 CREATE TABLE storage_array(pos INTEGER PRIMARY KEY, id TEXT, name TEXT, vendor_id TEXT,
   model_id TEXT);
+CREATE INDEX storage_array_by_id ON storage_array(id, pos);
 CREATE TABLE endpoint(array_pos INTEGER, pos INTEGER, local_uid TEXT, type INTEGER,
   lun_id TEXT, ip_address TEXT, server_mount TEXT, accessible INTEGER, configured INTEGER,
   PRIMARY KEY(array_pos, pos));
+CREATE INDEX endpoint_by_uid ON endpoint(local_uid);
 CREATE TABLE endpoint_address(array_pos INTEGER, endpoint_pos INTEGER, pos INTEGER,
   address TEXT, PRIMARY KEY(array_pos, endpoint_pos, pos));
 CREATE TABLE container(pos INTEGER PRIMARY KEY, name TEXT, id TEXT, vp_url TEXT,
-  max_tarn_size_mb INTEGER);
+  max_tarn_size_mb INTEGER, id_key TEXT);
+CREATE INDEX container_by_name ON container(name, pos);
+CREATE INDEX container_by_id ON container(id_key, pos);
+CREATE INDEX container_by_url ON container(vp_url, pos);
 CREATE TABLE container_array(container_pos INTEGER, pos INTEGER, array_id TEXT,
   PRIMARY KEY(container_pos, pos));
 CREATE TABLE tarn(container_pos INTEGER, pos INTEGER, uuid TEXT, logical_size_mb INTEGER,
   committed_size_mb INTEGER, unshared_size_mb INTEGER, storage_profile TEXT,
   block_size INTEGER, accessibility INTEGER, config_name TEXT, config_policy TEXT,
-  config_vm_uuid TEXT, config_mounted INTEGER, PRIMARY KEY(container_pos, pos));
+  config_vm_uuid TEXT, config_mounted INTEGER, uuid_key TEXT, PRIMARY KEY(container_pos, pos));
+CREATE INDEX tarn_by_uuid ON tarn(container_pos, uuid_key, pos);
+CREATE INDEX tarn_by_config_name ON tarn(container_pos, config_name, pos);
 CREATE TABLE tarn_metadata(container_pos INTEGER, tarn_pos INTEGER, pos INTEGER, key TEXT,
   value TEXT, PRIMARY KEY(container_pos, tarn_pos, pos));
 CREATE TABLE provider(pos INTEGER PRIMARY KEY, name TEXT, url TEXT, reserved TEXT);
+CREATE INDEX provider_by_name ON provider(name, pos);
+CREATE INDEX provider_by_url ON provider(url);
 CREATE TABLE provider_array(provider_pos INTEGER, pos INTEGER, array_id TEXT,
   is_active INTEGER, priority INTEGER, PRIMARY KEY(provider_pos, pos));
-CREATE TABLE mount(pos INTEGER PRIMARY KEY, name TEXT, id TEXT);
+CREATE TABLE mount(pos INTEGER PRIMARY KEY, name TEXT, id TEXT, id_key TEXT);
+CREATE INDEX mount_by_name ON mount(name, pos);
+CREATE INDEX mount_by_id ON mount(id_key, pos);
 CREATE TABLE mount_array(mount_pos INTEGER, pos INTEGER, array_id TEXT,
   PRIMARY KEY(mount_pos, pos));
+CREATE INDEX mount_array_by_array ON mount_array(array_id, mount_pos);
 CREATE TABLE host(kiro_context TEXT);
 CREATE TABLE failure(operation TEXT PRIMARY KEY, message TEXT, after INTEGER,
   times INTEGER, answer_null INTEGER);
+CREATE TABLE journal(seq INTEGER PRIMARY KEY, operation TEXT, args TEXT,
+  outcome TEXT, message TEXT);
 )sql";
 
 const char* const kTables[] = {"layout",        "daemon",          "fault_rule",
@@ -56,21 +80,29 @@ const char* const kTables[] = {"layout",        "daemon",          "fault_rule",
                                "container",     "container_array", "tarn",
                                "tarn_metadata", "provider",        "provider_array",
                                "mount",         "mount_array",     "host",
-                               "failure"};
+                               "failure",       "journal"};
 
-// The element at a stored position; a position outside the list means the
-// database was changed behind the world's back.
-template <typename T>
-T& At(std::vector<T>& list, int64_t pos, const char* table) {
-  if (pos < 0 || static_cast<uint64_t>(pos) >= list.size()) {
-    throw WorldError(std::string("the world database is inconsistent (table ") + table + ")");
+// Where each stored position of a list landed in the loaded list. Positions
+// may have gaps; a child naming a position the list lacks means the database
+// was changed behind the world's back.
+template <typename Key>
+class Positions {
+ public:
+  // The element at pos is at index of its list.
+  void Add(const Key& pos, size_t index) { index_.emplace(pos, index); }
+  size_t Of(const Key& pos, const char* table) const {
+    const auto found = index_.find(pos);
+    if (found == index_.end()) {
+      throw WorldError(std::string("the world database is inconsistent (table ") + table + ")");
+    }
+    return found->second;
   }
-  return list[static_cast<size_t>(pos)];
-}
 
-void ClearTables(sqlite3* db, std::initializer_list<const char*> tables) {
-  for (const char* table : tables) Exec(db, (std::string("DELETE FROM ") + table).c_str());
-}
+ private:
+  std::map<Key, size_t> index_;
+};
+using ListPositions = Positions<int64_t>;
+using NestedPositions = Positions<std::pair<int64_t, int64_t> >;
 
 int64_t Flag(bool value) { return value ? 1 : 0; }
 
@@ -103,21 +135,22 @@ void LoadDaemon(sqlite3* db, Daemon& daemon) {
     daemon.activations.push_back(
         {activations.Text(0), activations.Text(1), activations.Int(2) != 0, activations.Text(3)});
   }
-  Statement faults(db, "SELECT provider, url, status FROM provider_fault ORDER BY pos");
+  ListPositions faultAt;
+  Statement faults(db, "SELECT pos, provider, url, status FROM provider_fault ORDER BY pos");
   while (faults.Step()) {
-    daemon.providerFaults.push_back({faults.Text(0), faults.Text(1), faults.Text(2), {}});
+    faultAt.Add(faults.Int(0), daemon.providerFaults.size());
+    daemon.providerFaults.push_back({faults.Text(1), faults.Text(2), faults.Text(3), {}});
   }
   Statement faultArrays(db,
                         "SELECT fault_pos, array_id, is_active FROM provider_fault_array"
                         " ORDER BY fault_pos, pos");
   while (faultArrays.Step()) {
-    At(daemon.providerFaults, faultArrays.Int(0), "provider_fault_array")
-        .arrays.push_back({faultArrays.Text(1), faultArrays.Int(2) != 0});
+    daemon.providerFaults[faultAt.Of(faultArrays.Int(0), "provider_fault_array")].arrays.push_back(
+        {faultArrays.Text(1), faultArrays.Int(2) != 0});
   }
 }
 
 void SaveDaemon(sqlite3* db, const Daemon& daemon) {
-  ClearTables(db, {"daemon", "fault_rule", "activation", "provider_fault", "provider_fault_array"});
   Statement(db, "INSERT INTO daemon VALUES(?, ?, ?, ?, ?, ?)")
       .Bind(1, Flag(daemon.running))
       .Bind(2, int64_t{daemon.logLevel})
@@ -151,39 +184,33 @@ void SaveDaemon(sqlite3* db, const Daemon& daemon) {
 }
 
 void LoadArrays(sqlite3* db, std::vector<StorageArray>& arrays) {
-  Statement array(db, "SELECT id, name, vendor_id, model_id FROM storage_array ORDER BY pos");
+  ListPositions arrayAt;
+  Statement array(db, "SELECT pos, id, name, vendor_id, model_id FROM storage_array ORDER BY pos");
   while (array.Step()) {
-    arrays.push_back({array.Text(0), array.Text(1), array.Text(2), array.Text(3), {}});
+    arrayAt.Add(array.Int(0), arrays.size());
+    arrays.push_back({array.Text(1), array.Text(2), array.Text(3), array.Text(4), {}});
   }
+  NestedPositions endpointAt;
   Statement endpoint(db,
                      "SELECT array_pos, local_uid, type, lun_id, ip_address, server_mount,"
-                     " accessible, configured FROM endpoint ORDER BY array_pos, pos");
+                     " accessible, configured, pos FROM endpoint ORDER BY array_pos, pos");
   while (endpoint.Step()) {
-    ProtocolEndpoint pe;
-    pe.localUid = endpoint.Text(1);
-    const int64_t type = endpoint.Int(2);
-    if (type < int64_t(EndpointType::kScsi) || type > int64_t(EndpointType::kNfs4x)) {
-      throw WorldError("the world database is inconsistent (table endpoint)");
-    }
-    pe.type = static_cast<EndpointType>(type);
-    pe.lunId = endpoint.Text(3);
-    pe.ipAddress = endpoint.Text(4);
-    pe.serverMount = endpoint.Text(5);
-    pe.accessible = endpoint.Int(6) != 0;
-    pe.configured = endpoint.Int(7) != 0;
-    At(arrays, endpoint.Int(0), "endpoint").endpoints.push_back(std::move(pe));
+    ProtocolEndpoint pe = EndpointFrom(endpoint);
+    auto& endpoints = arrays[arrayAt.Of(endpoint.Int(0), "endpoint")].endpoints;
+    endpointAt.Add({endpoint.Int(0), endpoint.Int(8)}, endpoints.size());
+    endpoints.push_back(std::move(pe));
   }
   Statement address(db,
                     "SELECT array_pos, endpoint_pos, address FROM endpoint_address"
                     " ORDER BY array_pos, endpoint_pos, pos");
   while (address.Step()) {
-    auto& endpoints = At(arrays, address.Int(0), "endpoint_address").endpoints;
-    At(endpoints, address.Int(1), "endpoint_address").addresses.push_back(address.Text(2));
+    auto& endpoints = arrays[arrayAt.Of(address.Int(0), "endpoint_address")].endpoints;
+    endpoints[endpointAt.Of({address.Int(0), address.Int(1)}, "endpoint_address")]
+        .addresses.push_back(address.Text(2));
   }
 }
 
 void SaveArrays(sqlite3* db, const std::vector<StorageArray>& arrays) {
-  ClearTables(db, {"storage_array", "endpoint", "endpoint_address"});
   Statement array(db, "INSERT INTO storage_array VALUES(?, ?, ?, ?, ?)");
   Statement endpoint(db, "INSERT INTO endpoint VALUES(?, ?, ?, ?, ?, ?, ?, ?, ?)");
   Statement address(db, "INSERT INTO endpoint_address VALUES(?, ?, ?, ?)");
@@ -206,21 +233,25 @@ void SaveArrays(sqlite3* db, const std::vector<StorageArray>& arrays) {
 }
 
 void LoadContainers(sqlite3* db, std::vector<Container>& containers) {
-  Statement container(db, "SELECT name, id, vp_url, max_tarn_size_mb FROM container ORDER BY pos");
+  ListPositions containerAt;
+  Statement container(db,
+                      "SELECT pos, name, id, vp_url, max_tarn_size_mb FROM container ORDER BY pos");
   while (container.Step()) {
+    containerAt.Add(container.Int(0), containers.size());
     containers.push_back(
-        {container.Text(0), container.Text(1), container.Text(2), container.Int(3), {}, {}});
+        {container.Text(1), container.Text(2), container.Text(3), container.Int(4), {}, {}});
   }
   Statement array(db,
                   "SELECT container_pos, array_id FROM container_array"
                   " ORDER BY container_pos, pos");
   while (array.Step()) {
-    At(containers, array.Int(0), "container_array").arrays.push_back(array.Text(1));
+    containers[containerAt.Of(array.Int(0), "container_array")].arrays.push_back(array.Text(1));
   }
+  NestedPositions tarnAt;
   Statement tarn(db,
                  "SELECT container_pos, uuid, logical_size_mb, committed_size_mb,"
                  " unshared_size_mb, storage_profile, block_size, accessibility, config_name,"
-                 " config_policy, config_vm_uuid, config_mounted FROM tarn"
+                 " config_policy, config_vm_uuid, config_mounted, pos FROM tarn"
                  " ORDER BY container_pos, pos");
   while (tarn.Step()) {
     Tarn t;
@@ -234,28 +265,29 @@ void LoadContainers(sqlite3* db, std::vector<Container>& containers) {
     if (!tarn.IsNull(8)) {
       t.configTarn = ConfigTarn{tarn.Text(8), tarn.Text(9), tarn.Text(10), tarn.Int(11) != 0};
     }
-    At(containers, tarn.Int(0), "tarn").tarns.push_back(std::move(t));
+    auto& tarns = containers[containerAt.Of(tarn.Int(0), "tarn")].tarns;
+    tarnAt.Add({tarn.Int(0), tarn.Int(12)}, tarns.size());
+    tarns.push_back(std::move(t));
   }
   Statement metadata(db,
                      "SELECT container_pos, tarn_pos, key, value FROM tarn_metadata"
                      " ORDER BY container_pos, tarn_pos, pos");
   while (metadata.Step()) {
-    auto& tarns = At(containers, metadata.Int(0), "tarn_metadata").tarns;
-    At(tarns, metadata.Int(1), "tarn_metadata")
-        .metadata.emplace_back(metadata.Text(2), metadata.Text(3));
+    auto& tarns = containers[containerAt.Of(metadata.Int(0), "tarn_metadata")].tarns;
+    tarns[tarnAt.Of({metadata.Int(0), metadata.Int(1)}, "tarn_metadata")].metadata.emplace_back(
+        metadata.Text(2), metadata.Text(3));
   }
 }
 
 void SaveContainers(sqlite3* db, const std::vector<Container>& containers) {
-  ClearTables(db, {"container", "container_array", "tarn", "tarn_metadata"});
-  Statement container(db, "INSERT INTO container VALUES(?, ?, ?, ?, ?)");
+  Statement container(db, "INSERT INTO container VALUES(?, ?, ?, ?, ?, ?)");
   Statement array(db, "INSERT INTO container_array VALUES(?, ?, ?)");
-  Statement tarn(db, "INSERT INTO tarn VALUES(?, ?, ?, ?, ?, ?, ?, ?, ?, ?, ?, ?, ?)");
+  Statement tarn(db, "INSERT INTO tarn VALUES(?, ?, ?, ?, ?, ?, ?, ?, ?, ?, ?, ?, ?, ?)");
   Statement metadata(db, "INSERT INTO tarn_metadata VALUES(?, ?, ?, ?, ?)");
   for (size_t i = 0; i < containers.size(); ++i) {
     const Container& c = containers[i];
     container.Bind(1, int64_t(i)).Bind(2, c.name).Bind(3, c.id).Bind(4, c.vpUrl);
-    container.Bind(5, c.maxTarnSizeMB).Run();
+    container.Bind(5, c.maxTarnSizeMB).Bind(6, ContainerIdText(c.id)).Run();
     for (size_t j = 0; j < c.arrays.size(); ++j) {
       array.Bind(1, int64_t(i)).Bind(2, int64_t(j)).Bind(3, c.arrays[j]).Run();
     }
@@ -267,7 +299,7 @@ void SaveContainers(sqlite3* db, const std::vector<Container>& containers) {
       const ConfigTarn* ct = t.configTarn ? &*t.configTarn : nullptr;
       tarn.Bind(10, ct ? std::optional<std::string>(ct->name) : std::nullopt);
       tarn.Bind(11, ct ? ct->policy : std::string()).Bind(12, ct ? ct->vmUuid : std::string());
-      tarn.Bind(13, Flag(ct != nullptr && ct->mounted)).Run();
+      tarn.Bind(13, Flag(ct != nullptr && ct->mounted)).Bind(14, UuidKey(t.uuid)).Run();
       for (size_t k = 0; k < t.metadata.size(); ++k) {
         metadata.Bind(1, int64_t(i)).Bind(2, int64_t(j)).Bind(3, int64_t(k));
         metadata.Bind(4, t.metadata[k].first).Bind(5, t.metadata[k].second).Run();
@@ -277,21 +309,22 @@ void SaveContainers(sqlite3* db, const std::vector<Container>& containers) {
 }
 
 void LoadProviders(sqlite3* db, std::vector<Provider>& providers) {
-  Statement provider(db, "SELECT name, url, reserved FROM provider ORDER BY pos");
+  ListPositions providerAt;
+  Statement provider(db, "SELECT pos, name, url, reserved FROM provider ORDER BY pos");
   while (provider.Step()) {
-    providers.push_back({provider.Text(0), provider.Text(1), provider.Text(2), {}});
+    providerAt.Add(provider.Int(0), providers.size());
+    providers.push_back({provider.Text(1), provider.Text(2), provider.Text(3), {}});
   }
   Statement array(db,
                   "SELECT provider_pos, array_id, is_active, priority FROM provider_array"
                   " ORDER BY provider_pos, pos");
   while (array.Step()) {
-    At(providers, array.Int(0), "provider_array")
-        .arrays.push_back({array.Text(1), array.Int(2) != 0, static_cast<int32_t>(array.Int(3))});
+    providers[providerAt.Of(array.Int(0), "provider_array")].arrays.push_back(
+        {array.Text(1), array.Int(2) != 0, static_cast<int32_t>(array.Int(3))});
   }
 }
 
 void SaveProviders(sqlite3* db, const std::vector<Provider>& providers) {
-  ClearTables(db, {"provider", "provider_array"});
   Statement provider(db, "INSERT INTO provider VALUES(?, ?, ?, ?)");
   Statement array(db, "INSERT INTO provider_array VALUES(?, ?, ?, ?, ?)");
   for (size_t i = 0; i < providers.size(); ++i) {
@@ -305,18 +338,24 @@ void SaveProviders(sqlite3* db, const std::vector<Provider>& providers) {
 }
 
 void LoadMounts(sqlite3* db, std::vector<Mount>& mounted) {
-  Statement mount(db, "SELECT name, id FROM mount ORDER BY pos");
-  while (mount.Step()) mounted.push_back({mount.Text(0), mount.Text(1), {}});
+  ListPositions mountAt;
+  Statement mount(db, "SELECT pos, name, id FROM mount ORDER BY pos");
+  while (mount.Step()) {
+    mountAt.Add(mount.Int(0), mounted.size());
+    mounted.push_back({mount.Text(1), mount.Text(2), {}});
+  }
   Statement array(db, "SELECT mount_pos, array_id FROM mount_array ORDER BY mount_pos, pos");
-  while (array.Step()) At(mounted, array.Int(0), "mount_array").arrays.push_back(array.Text(1));
+  while (array.Step()) {
+    mounted[mountAt.Of(array.Int(0), "mount_array")].arrays.push_back(array.Text(1));
+  }
 }
 
 void SaveMounts(sqlite3* db, const std::vector<Mount>& mounted) {
-  ClearTables(db, {"mount", "mount_array"});
-  Statement mount(db, "INSERT INTO mount VALUES(?, ?, ?)");
+  Statement mount(db, "INSERT INTO mount VALUES(?, ?, ?, ?)");
   Statement array(db, "INSERT INTO mount_array VALUES(?, ?, ?)");
   for (size_t i = 0; i < mounted.size(); ++i) {
-    mount.Bind(1, int64_t(i)).Bind(2, mounted[i].name).Bind(3, mounted[i].id).Run();
+    mount.Bind(1, int64_t(i)).Bind(2, mounted[i].name).Bind(3, mounted[i].id);
+    mount.Bind(4, ContainerIdText(mounted[i].id)).Run();
     for (size_t j = 0; j < mounted[i].arrays.size(); ++j) {
       array.Bind(1, int64_t(i)).Bind(2, int64_t(j)).Bind(3, mounted[i].arrays[j]).Run();
     }
@@ -330,7 +369,6 @@ void LoadKiro(sqlite3* db, std::optional<std::string>& context) {
 }
 
 void SaveKiro(sqlite3* db, const std::optional<std::string>& context) {
-  ClearTables(db, {"host"});
   Statement(db, "INSERT INTO host VALUES(?)").Bind(1, context).Run();
 }
 
@@ -342,20 +380,48 @@ bool RequireWorldOrEmpty(sqlite3* db) {
   return tables.Int(0) > 0;
 }
 
+// The stored layout version, or -1 when there is none. One statement: this is
+// all a process's first operation checks of a world that exists.
+int64_t StoredLayout(sqlite3* db) {
+  sqlite3_stmt* stmt = nullptr;
+  if (sqlite3_prepare_v2(db, "SELECT version FROM layout", -1, &stmt, nullptr) != SQLITE_OK) {
+    sqlite3_finalize(stmt);
+    return -1;
+  }
+  const int64_t version = sqlite3_step(stmt) == SQLITE_ROW ? sqlite3_column_int64(stmt, 0) : -1;
+  sqlite3_finalize(stmt);
+  return version;
+}
+
 }  // namespace
 
-void RefuseForeignDatabase(sqlite3* db) { RequireWorldOrEmpty(db); }
+ProtocolEndpoint EndpointFrom(const Statement& row) {
+  ProtocolEndpoint pe;
+  pe.localUid = row.Text(1);
+  const int64_t type = row.Int(2);
+  if (type < int64_t(EndpointType::kScsi) || type > int64_t(EndpointType::kNfs4x)) {
+    throw WorldError("the world database is inconsistent (table endpoint)");
+  }
+  pe.type = static_cast<EndpointType>(type);
+  pe.lunId = row.Text(3);
+  pe.ipAddress = row.Text(4);
+  pe.serverMount = row.Text(5);
+  pe.accessible = row.Int(6) != 0;
+  pe.configured = row.Int(7) != 0;
+  return pe;
+}
+
+void RefuseForeignDatabase(sqlite3* db) {
+  if (StoredLayout(db) != kLayoutVersion) RequireWorldOrEmpty(db);
+}
 
 bool HasWorld(sqlite3* db) {
+  const int64_t version = StoredLayout(db);
+  if (version == kLayoutVersion) return true;
   if (!RequireWorldOrEmpty(db)) return false;
-  Statement layout(db, "SELECT version FROM layout");
-  const int64_t version = layout.Step() ? layout.Int(0) : -1;
-  if (version != kLayoutVersion) {
-    throw WorldError("the world at " + DatabasePath() + " has layout " + std::to_string(version) +
-                     " but this build reads layout " + std::to_string(kLayoutVersion) +
-                     "; replace it with hyrasim init");
-  }
-  return true;
+  throw WorldError("the world at " + DatabasePath() + " has layout " + std::to_string(version) +
+                   " but this build reads layout " + std::to_string(kLayoutVersion) +
+                   "; replace it with hyrasim init --demo or hyrasim init --scenario FILE");
 }
 
 void CreateSchema(sqlite3* db) {
@@ -377,13 +443,13 @@ WorldState LoadWorld(sqlite3* db) {
   return world;
 }
 
-void SaveWorld(sqlite3* db, const WorldState& world, unsigned sections) {
-  if (sections & kSectionDaemon) SaveDaemon(db, world.daemon);
-  if (sections & kSectionArrays) SaveArrays(db, world.arrays);
-  if (sections & kSectionContainers) SaveContainers(db, world.containers);
-  if (sections & kSectionProviders) SaveProviders(db, world.providers);
-  if (sections & kSectionMounts) SaveMounts(db, world.mounted);
-  if (sections & kSectionKiro) SaveKiro(db, world.kiroContext);
+void SaveWorld(sqlite3* db, const WorldState& world) {
+  SaveDaemon(db, world.daemon);
+  SaveArrays(db, world.arrays);
+  SaveContainers(db, world.containers);
+  SaveProviders(db, world.providers);
+  SaveMounts(db, world.mounted);
+  SaveKiro(db, world.kiroContext);
 }
 
 }  // namespace HyraSim

@@ -2,6 +2,7 @@
 
 #include "Failures.h"
 #include "Operation.h"
+#include "Rows.h"
 #include "Scenario.h"
 #include "Schema.h"
 
@@ -14,7 +15,7 @@ void InitScenario(const std::string& scenarioJson) {
   const WorldState world = ReadScenario(scenarioJson);
   WithDatabase(true, false, [&](sqlite3* db) {
     CreateSchema(db);
-    SaveWorld(db, world, kSectionAll);
+    SaveWorld(db, world);
   });
 }
 
@@ -25,11 +26,7 @@ std::string ExportScenario() {
 }
 
 void SetDaemonRunning(bool running) {
-  WithDatabase(true, true, [&](sqlite3* db) {
-    WorldState world = LoadWorld(db);
-    world.daemon.running = running;
-    SaveWorld(db, world, kSectionDaemon);
-  });
+  WithDatabase(true, true, [&](sqlite3* db) { StoreDaemonRunning(db, running); });
 }
 
 void ArmFailure(const std::string& operation, const FailureSpec& spec) {

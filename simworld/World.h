@@ -39,9 +39,9 @@ void SetDaemonRunning(bool running);
 // How an armed operation fails.
 struct FailureSpec {
   std::string message = "injected failure";
-  int64_t after = 0;   // calls that pass first
-  int64_t times = 1;   // calls that then fail
-  bool null = false;   // answer "nothing" instead of an error
+  int64_t after = 0;  // calls that pass first
+  int64_t times = 1;  // calls that then fail
+  bool null = false;  // answer "nothing" instead of an error
 };
 
 // Arms an operation by its name (a storage-control operation such as
@@ -53,5 +53,20 @@ void ClearFailures();
 std::vector<std::string> ArmableOperations();
 // The armed operations in name order, with the calls still to pass and fail.
 std::vector<std::pair<std::string, FailureSpec> > ArmedFailures();
+
+// One host call as the journal keeps it. outcome is "passed", "refused" (the
+// host's own refusal, message saying why), "failed" (an armed failure,
+// message being its text) or "nothing" (an armed failure answering nothing).
+struct JournalEntry {
+  int64_t seq = 0;  // grows with every call, across processes; 1 again after a clear
+  std::string operation;
+  std::vector<std::string> args;  // each cut to about 200 bytes
+  std::string outcome;
+  std::string message;
+};
+
+// The latest host calls (at most 10,000), oldest first.
+std::vector<JournalEntry> ReadJournal();
+void ClearJournal();
 
 }  // namespace HyraSim

@@ -2,6 +2,7 @@
 #include <algorithm>
 #include <cstring>
 #include <string>
+#include <unordered_map>
 #include <vector>
 
 #include "ContainerId.h"
@@ -11,7 +12,6 @@
 #include "TarnLib/TarnLib.h"
 
 using HyraSim::Access;
-using HyraSim::WorldState;
 using TarnSim::Allocate;
 using TarnSim::CallDaemon;
 using TarnSim::CopyText;
@@ -20,10 +20,12 @@ using TarnSim::Refusal;
 
 namespace {
 
-// What one exported container carries to its record.
+// What one exported container carries to its record. Arrays are shared by
+// many containers and read once per call; the pointers stay valid while the
+// call's array cache lives.
 struct ExportedContainer {
   HyraSim::Container container;
-  std::vector<HyraSim::StorageArray> arrays;
+  std::vector<const HyraSim::StorageArray*> arrays;
 };
 
 void FillEndpoint(ProtocolEndpointRecord*& slot, const HyraSim::ProtocolEndpoint& pe) {
@@ -79,7 +81,7 @@ void FillContainer(StorageContainerRecord*& slot, const ExportedContainer& expor
   slot->arrays = Allocate<StorageArrayRecord*>(exported.arrays.size());
   slot->arrayCount = Count32(exported.arrays.size());
   for (size_t i = 0; i < exported.arrays.size(); ++i)
-    FillArray(slot->arrays[i], exported.arrays[i]);
+    FillArray(slot->arrays[i], *exported.arrays[i]);
 }
 
 void FreeEndpoint(ProtocolEndpointRecord* pe) {
@@ -129,29 +131,7 @@ TarnLib_ErrorEx ErrorRecord(TarnLib_Status status) {
   return error;
 }
 
-// The container the daemon knows by this id text, which must be a normal form.
-HyraSim::Container& KnownContainer(WorldState& w, const char* containerId) {
-  if (containerId == nullptr) throw Refusal{TarnSim::kInvalidArgument};
-  const auto normal = HyraSim::NormalContainerId(containerId);
-  if (!normal || *normal != containerId) throw Refusal{TarnSim::kInvalidArgument};
-  HyraSim::Container* container = w.DaemonContainer(*normal);
-  if (container == nullptr) throw Refusal{TarnSim::kNotFound};
-  return *container;
-}
-
 }  // namespace
-
-namespace TarnSim {
-
-HyraSim::Tarn FindKnownTarn(WorldState& w, const char* containerId, const char* uuid) {
-  HyraSim::Container& container = KnownContainer(w, containerId);
-  if (uuid == nullptr) throw Refusal{kInvalidArgument};
-  const HyraSim::Tarn* tarn = HyraSim::FindTarn(container, uuid);
-  if (tarn == nullptr) throw Refusal{kNotFound};
-  return *tarn;
-}
-
-}  // namespace TarnSim
 
 extern "C" void TarnLib_FreeStorageContainerResult(StorageContainerResult* result) {
   if (result == nullptr) return;
@@ -171,24 +151,27 @@ extern "C" void TarnLib_FreeStorageContainerResult(StorageContainerResult* resul
   free(result);
 }
 
-extern "C" TarnLib_ErrorEx TarnLib_GetStorageContainer(int32_t /*scope*/, const char* /*filter*/,
+extern "C" TarnLib_ErrorEx TarnLib_GetStorageContainer(int32_t scope, const char* filter,
                                                        StorageContainerResult** result) {
   if (result == nullptr) return ErrorRecord(TarnSim::kInvalidArgument);
   std::vector<ExportedContainer> exported;
+  // Node-based, so that the arrays do not move while containers point at them.
+  std::unordered_map<std::string, std::optional<HyraSim::StorageArray> > arrays;
   const TarnSim::CallOutcome outcome =
-      CallDaemon("TarnLib_GetStorageContainer", Access::kRead, [&](WorldState& w) {
-        for (const auto& container : w.containers) {
-          if (!w.IsExported(container)) continue;
-          ExportedContainer entry{container, {}};
-          for (const auto& arrayId : container.arrays) {
-            if (const HyraSim::StorageArray* array = w.FindArray(arrayId)) {
-              entry.arrays.push_back(*array);
-            }
-          }
-          exported.push_back(std::move(entry));
-        }
-        return 0u;
-      });
+      CallDaemon("TarnLib_GetStorageContainer", Access::kRead,
+                 {std::to_string(scope), TarnSim::Arg(filter)}, [&](sqlite3* db) {
+                   HyraSim::ForEachExportedContainer(db, [&](const HyraSim::Container& container) {
+                     ExportedContainer entry{container, {}};
+                     for (const auto& arrayId : container.arrays) {
+                       auto found = arrays.find(arrayId);
+                       if (found == arrays.end()) {
+                         found = arrays.emplace(arrayId, HyraSim::FindArray(db, arrayId)).first;
+                       }
+                       if (found->second) entry.arrays.push_back(&*found->second);
+                     }
+                     exported.push_back(std::move(entry));
+                   });
+                 });
   if (outcome.status != TARNLIB_OK) return ErrorRecord(outcome.status);
   if (outcome.nothing) {
     *result = nullptr;
@@ -231,21 +214,17 @@ extern "C" void TarnLib_FreeQueryResult(QueryResult* result) {
 
 extern "C" TarnLib_Status TarnLib_QueryAllConfigTarns(const char* containerId, int32_t maxEntries,
                                                       int32_t offset, QueryResult** result,
-                                                      int32_t /*flags*/) {
+                                                      int32_t flags) {
   if (result == nullptr) return TarnSim::kInvalidArgument;
   std::vector<HyraSim::Tarn> configTarns;
-  const TarnSim::CallOutcome outcome =
-      CallDaemon("TarnLib_QueryAllConfigTarns", Access::kRead, [&](WorldState& w) {
-        HyraSim::Container& container = KnownContainer(w, containerId);
+  const TarnSim::CallOutcome outcome = CallDaemon(
+      "TarnLib_QueryAllConfigTarns", Access::kRead,
+      {TarnSim::Arg(containerId), std::to_string(maxEntries), std::to_string(offset),
+       std::to_string(flags)},
+      [&](sqlite3* db) {
+        const HyraSim::ContainerRow container = TarnSim::FindKnownContainer(db, containerId);
         if (maxEntries < 0 || offset < 0) throw Refusal{TarnSim::kInvalidArgument};
-        int64_t skipped = 0;
-        for (const auto& tarn : container.tarns) {
-          if (!tarn.configTarn) continue;
-          if (skipped++ < offset) continue;
-          if (configTarns.size() >= static_cast<size_t>(maxEntries)) break;
-          configTarns.push_back(tarn);
-        }
-        return 0u;
+        configTarns = HyraSim::ReadConfigTarns(db, container.pos, offset, maxEntries);
       });
   if (outcome.nothing) {
     *result = nullptr;
@@ -274,8 +253,11 @@ extern "C" TarnLib_Status TarnLib_QueryAllConfigTarns(const char* containerId, i
 
 extern "C" bool TarnLib_NormalizeContainerIdString(const char* id, char* normalized) {
   try {
-    const HyraSim::Injection injection = HyraSim::CountCall("TarnLib_NormalizeContainerIdString");
+    const HyraSim::Injection injection =
+        HyraSim::CountCall("TarnLib_NormalizeContainerIdString", {TarnSim::Arg(id)});
     if (injection.fired) return false;
+  } catch (const HyraSim::UnknownOperation&) {
+    throw;
   } catch (...) {
     // Normalising is done here, not by the daemon; an unreadable world only
     // means that no arming can be seen.

@@ -2,19 +2,24 @@
 
 #include <new>
 
+#include "ContainerId.h"
 #include "Status.h"
 #include "World.h"
 
 namespace TarnSim {
 
-CallOutcome CallDaemon(const char* function, HyraSim::Access access,
-                       const std::function<unsigned(HyraSim::WorldState&)>& body) {
+Refusal::Refusal(TarnLib_Status refused) : status(refused), text_(StatusText(refused)) {}
+
+const char* Refusal::what() const noexcept { return text_.c_str(); }
+
+CallOutcome CallDaemon(const char* function, HyraSim::Access access, const HyraSim::CallArgs& args,
+                       const std::function<void(sqlite3*)>& body) {
   if (!IsOpen()) return {kNotInitialised, false};
   try {
     const HyraSim::Injection injection =
-        HyraSim::RunOperation(function, access, [&](HyraSim::WorldState& w) {
-          if (!w.daemon.running) throw Refusal{kDaemonNotRunning};
-          return body(w);
+        HyraSim::RunOperation(function, access, args, [&](sqlite3* db) {
+          if (!HyraSim::DaemonRunning(db)) throw Refusal{kDaemonNotRunning};
+          body(db);
         });
     if (!injection.fired) return {TARNLIB_OK, false};
     if (injection.null) return {TARNLIB_OK, true};
@@ -26,6 +31,8 @@ CallOutcome CallDaemon(const char* function, HyraSim::Access access,
 
 TarnLib_Status StatusOfCurrentException() {
   try {
+    throw;
+  } catch (const HyraSim::UnknownOperation&) {
     throw;
   } catch (const Refusal& refusal) {
     return refusal.status;
@@ -41,5 +48,24 @@ TarnLib_Status StatusOfCurrentException() {
     return kInternalError;
   }
 }
+
+HyraSim::ContainerRow FindKnownContainer(sqlite3* db, const char* containerId) {
+  if (containerId == nullptr) throw Refusal{kInvalidArgument};
+  const auto normal = HyraSim::NormalContainerId(containerId);
+  if (!normal || *normal != containerId) throw Refusal{kInvalidArgument};
+  auto container = HyraSim::FindExportedContainer(db, *normal);
+  if (!container) throw Refusal{kNotFound};
+  return *container;
+}
+
+KnownTarn FindKnownTarn(sqlite3* db, const char* containerId, const char* uuid) {
+  const HyraSim::ContainerRow container = FindKnownContainer(db, containerId);
+  if (uuid == nullptr) throw Refusal{kInvalidArgument};
+  auto tarn = HyraSim::FindTarnIn(db, container.pos, uuid);
+  if (!tarn) throw Refusal{kNotFound};
+  return {container.pos, *tarn};
+}
+
+std::string Arg(const char* text) { return text != nullptr ? text : "(null)"; }
 
 }  // namespace TarnSim

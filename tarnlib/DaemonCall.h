@@ -2,17 +2,28 @@
 // daemon's running state and refusals, all turned into a status.
 #pragma once
 
-#include <functional>
+#include <sqlite3.h>
 
-#include "Model.h"
+#include <exception>
+#include <functional>
+#include <string>
+
 #include "Operation.h"
+#include "Rows.h"
 #include "TarnLib/TarnLib.h"
 
 namespace TarnSim {
 
-// Thrown by a call body to refuse the call with status.
-struct Refusal {
+// Thrown by a call body to refuse the call with status; its text is the
+// status text, which the journal records.
+class Refusal : public std::exception {
+ public:
+  explicit Refusal(TarnLib_Status refused);
+  const char* what() const noexcept override;
   TarnLib_Status status;
+
+ private:
+  std::string text_;
 };
 
 struct CallOutcome {
@@ -21,19 +32,31 @@ struct CallOutcome {
   bool Succeeded() const { return status == TARNLIB_OK && !nothing; }
 };
 
-// Runs body as a call of function. Fails with kNotInitialised while this
-// process holds no opening, with the injected text when an armed failure
-// fires, with kDaemonNotRunning while the daemon is stopped, and with the
-// status of a Refusal the body throws.
-CallOutcome CallDaemon(const char* function, HyraSim::Access access,
-                       const std::function<unsigned(HyraSim::WorldState&)>& body);
+// Runs body as a call of function, journaled with args. Fails with
+// kNotInitialised while this process holds no opening, with the injected text
+// when an armed failure fires, with kDaemonNotRunning while the daemon is
+// stopped, and with the status of a Refusal the body throws.
+CallOutcome CallDaemon(const char* function, HyraSim::Access access, const HyraSim::CallArgs& args,
+                       const std::function<void(sqlite3*)>& body);
 
-// The status of an exception caught at the library's C boundary.
+// The status of an exception caught at the library's C boundary. A call made
+// under a name that cannot be armed is a programming error and is thrown on.
 TarnLib_Status StatusOfCurrentException();
 
-// The tarn uuid of the container the daemon knows as containerId, which must
-// be in normal form; anything else is refused.
-HyraSim::Tarn FindKnownTarn(HyraSim::WorldState& w, const char* containerId, const char* uuid);
+// The container the daemon knows as containerId, which must be in normal
+// form; anything else is refused.
+HyraSim::ContainerRow FindKnownContainer(sqlite3* db, const char* containerId);
+
+// The tarn uuid of the container the daemon knows as containerId, with the
+// container's position; anything else is refused.
+struct KnownTarn {
+  int64_t containerPos = 0;
+  HyraSim::TarnRow row;
+};
+KnownTarn FindKnownTarn(sqlite3* db, const char* containerId, const char* uuid);
+
+// A text argument for the journal; a null pointer shows as "(null)".
+std::string Arg(const char* text);
 
 // Process-wide openings of the library.
 bool IsOpen();

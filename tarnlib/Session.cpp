@@ -1,8 +1,10 @@
 // Opening and closing the library. Openings are counted per process: every
 // successful TarnLib_Init needs one TarnLib_Exit.
 #include <mutex>
+#include <string>
 
 #include "DaemonCall.h"
+#include "Status.h"
 #include "TarnLib/TarnLib.h"
 #include "TarnLibSim.h"
 
@@ -33,23 +35,26 @@ bool IsOpen() {
 
 using TarnSim::TheCounters;
 
-extern "C" bool TarnLib_Init(int32_t /*flags*/, int32_t /*options*/) {
+extern "C" bool TarnLib_Init(int32_t flags, int32_t options) {
   {
     const std::lock_guard<std::mutex> lock(TheCounters().mutex);
     ++TheCounters().initCalls;
   }
-  bool running = false;
+  // Opening is made seven times while a command tree is built, so it reads
+  // the daemon's running flag alone, on the connection the process keeps.
   try {
     const HyraSim::Injection injection =
-        HyraSim::RunOperation("TarnLib_Init", HyraSim::Access::kRead, [&](HyraSim::WorldState& w) {
-          running = w.daemon.running;
-          return 0u;
-        });
+        HyraSim::RunOperation("TarnLib_Init", HyraSim::Access::kRead,
+                              {std::to_string(flags), std::to_string(options)}, [](sqlite3* db) {
+                                if (!HyraSim::DaemonRunning(db))
+                                  throw TarnSim::Refusal{TarnSim::kDaemonNotRunning};
+                              });
     if (injection.fired) return false;
+  } catch (const HyraSim::UnknownOperation&) {
+    throw;
   } catch (...) {
     return false;
   }
-  if (!running) return false;
   const std::lock_guard<std::mutex> lock(TheCounters().mutex);
   ++TheCounters().openings;
   return true;

@@ -9,7 +9,6 @@
 
 using HyraSim::Access;
 using HyraSim::Tarn;
-using HyraSim::WorldState;
 using TarnSim::Allocate;
 using TarnSim::CopyText;
 
@@ -19,16 +18,18 @@ constexpr int64_t kBytesPerMB = 1024 * 1024;
 
 // Looks the tarn up as the call function and, unless an armed failure asks
 // for nothing, hands it to build, which fills the result. place is set only
-// on success.
+// on success. With metadata the tarn's metadata is read as well.
 template <typename T, typename Build>
 TarnLib_Status QueryTarn(const char* function, const char* containerId, const char* uuid, T** place,
-                         Build build) {
+                         Build build, bool metadata = false) {
   if (place == nullptr) return TarnSim::kInvalidArgument;
   Tarn tarn;
-  const TarnSim::CallOutcome outcome =
-      TarnSim::CallDaemon(function, Access::kRead, [&](WorldState& w) {
-        tarn = TarnSim::FindKnownTarn(w, containerId, uuid);
-        return 0u;
+  const TarnSim::CallOutcome outcome = TarnSim::CallDaemon(
+      function, Access::kRead, {TarnSim::Arg(containerId), TarnSim::Arg(uuid)}, [&](sqlite3* db) {
+        const TarnSim::KnownTarn known = TarnSim::FindKnownTarn(db, containerId, uuid);
+        tarn = known.row.tarn;
+        if (metadata)
+          tarn.metadata = HyraSim::ReadTarnMetadata(db, known.containerPos, known.row.pos);
       });
   if (outcome.status != TARNLIB_OK) return outcome.status;
   if (outcome.nothing) {
@@ -93,19 +94,22 @@ extern "C" void TarnLib_FreeTarnMetadata(TarnMetadata* metadata) {
 
 extern "C" TarnLib_Status TarnLib_GetTarnMetadata(const char* containerId, const char* uuid,
                                                   TarnMetadata** metadata) {
-  return QueryTarn("TarnLib_GetTarnMetadata", containerId, uuid, metadata, [](const Tarn& tarn) {
-    TarnSim::Owned<TarnMetadata> built(Allocate<TarnMetadata>(), &TarnLib_FreeTarnMetadata);
-    // Each entry joins the chain before it is filled, so the chain is always
-    // whole enough to be freed.
-    TarnMetadataEntry** next = &built->first;
-    for (const auto& pair : tarn.metadata) {
-      *next = Allocate<TarnMetadataEntry>();
-      (*next)->key = CopyText(pair.first);
-      (*next)->value = CopyText(pair.second);
-      next = &(*next)->next;
-    }
-    return built.release();
-  });
+  return QueryTarn(
+      "TarnLib_GetTarnMetadata", containerId, uuid, metadata,
+      [](const Tarn& tarn) {
+        TarnSim::Owned<TarnMetadata> built(Allocate<TarnMetadata>(), &TarnLib_FreeTarnMetadata);
+        // Each entry joins the chain before it is filled, so the chain is always
+        // whole enough to be freed.
+        TarnMetadataEntry** next = &built->first;
+        for (const auto& pair : tarn.metadata) {
+          *next = Allocate<TarnMetadataEntry>();
+          (*next)->key = CopyText(pair.first);
+          (*next)->value = CopyText(pair.second);
+          next = &(*next)->next;
+        }
+        return built.release();
+      },
+      true);
 }
 
 extern "C" TarnLib_Status TarnLib_UnsharedChunksTarn(const char* containerId, const char* uuid,

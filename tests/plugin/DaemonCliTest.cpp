@@ -28,10 +28,15 @@ TEST_F(CliTest, RefusedDaemonSettingsChangeNothing) {
   ASSERT_EQ(Sim({"fail", "TarnLib_DebugCommand", "--message", "daemon busy"}).status, 0);
   EXPECT_EQ(Tarn({"daemon", "set", "-t", "5"}),
             (Outcome{1, "", "TarnLib_DebugCommand  failed with error daemon busy\n"}));
+  ASSERT_EQ(Sim({"journal", "--clear"}).status, 0);
   EXPECT_EQ(Tarn({"faultInjection", "rule", "set", "-f", "NET", "-t", "4294967297"}),
             (Outcome{1, "",
                      "Invalid value for parameter time: 4294967297 is outside the range "
                      "-2147483648 to 2147483647\n"}));
+  // Nothing was sent: only openings of the daemon library reached the host.
+  const json journal = json::parse(Sim({"journal", "--json"}).out);
+  EXPECT_FALSE(journal.empty());
+  for (const json& call : journal) EXPECT_EQ(call["operation"], "TarnLib_Init") << call;
   EXPECT_EQ(World()["daemon"], daemon);
 }
 

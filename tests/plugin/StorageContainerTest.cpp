@@ -152,7 +152,9 @@ TEST_F(StorageContainerTest, RecordsDescribeEndpointsAndReadMissingPartsAsEmpty)
 }
 
 TEST_F(StorageContainerTest, AddMountsAsGivenAndAnswersWhetherTheHostMounted) {
-  const json mount = {{"name", "silver"}, {"id", "ABC"}, {"arrays", {"b", "a"}}};
+  // The id is mounted in the form given, not in its normal form.
+  const std::string id = "9B8A7C6D5E4F4A3B8C2D1E0F9A8B7C6D";
+  const json mount = {{"name", "silver"}, {"id", id}, {"arrays", {"b", "a"}}};
   const struct {
     Arming arming;
     T sinkThrows;
@@ -164,7 +166,7 @@ TEST_F(StorageContainerTest, AddMountsAsGivenAndAnswersWhetherTheHostMounted) {
       {{"AddTarnFileSystem", 0, false}, T::kNothing, {"error: boom"}, nullptr},
       {{}, T::kResult, {"result: true", "error: sink failed"}, mount},
   };
-  const json args = {{"container-name", "silver"}, {"container-id", "ABC"}, {"array", {"b", "a"}}};
+  const json args = {{"container-name", "silver"}, {"container-id", id}, {"array", {"b", "a"}}};
   for (const auto& c : cases) {
     Prepare(Containers(0, {}), c.arming);
     EXPECT_EQ(RunCommand(*StorageContainerAdd::New(), Args(args), c.sinkThrows), c.calls);

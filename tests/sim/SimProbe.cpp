@@ -2,6 +2,7 @@
 // see what several processes do to one world. A host failure is printed as
 // "error: TEXT" with exit status 3.
 #include <iostream>
+#include <memory>
 #include <string>
 
 #include "HostCtl/Lib.h"
@@ -21,6 +22,13 @@ int main(int argc, char** argv) {
       }
       return 0;
     }
+    if (command == "mount" && argc == 4) {
+      std::string id = argv[3];
+      const std::unique_ptr<HostCtl::Storage::TarnFileSystem> mounted(
+          host.AddTarnFileSystem(argv[2], id, {}, true));
+      std::cout << "mounted " << (mounted ? mounted->GetContainerName() : "nothing") << "\n";
+      return 0;
+    }
     if (command == "vp-exists" && argc == 3) {
       std::cout << (host.TarnVpExists(argv[2]) ? "true" : "false") << "\n";
       return 0;
@@ -29,6 +37,6 @@ int main(int argc, char** argv) {
     std::cout << "error: " << e.GetMessage() << "\n";
     return 3;
   }
-  std::cerr << "usage: sim_probe add-providers PREFIX COUNT | vp-exists NAME\n";
+  std::cerr << "usage: sim_probe add-providers PREFIX COUNT | mount NAME ID | vp-exists NAME\n";
   return 2;
 }

@@ -74,8 +74,6 @@ TEST_F(StorageControl, MountKeepsIdAsGivenAnswersForItsTarnsAndIsFoundByPath) {
                 HostCtl::Storage::TARN_INACCESSIBLE, HostCtl::Storage::TARN_UNCONFIRMED,
                 HostCtl::Storage::TARN_NON_EXISTENT, HostCtl::Storage::TARN_INACCESSIBLE}));
   EXPECT_TRUE(silver->CheckTarnAccessibility({}).empty());
-  EXPECT_EQ(MessageOf([&] { host.AddTarnFileSystem("silver", id, {}, true); }),
-            "A container file system named silver is already mounted at /hyra/volumes/silver");
 
   auto mounted = Mounted(host);
   ASSERT_EQ(mounted.size(), 2u);
@@ -100,6 +98,41 @@ TEST_F(StorageControl, MountKeepsIdAsGivenAnswersForItsTarnsAndIsFoundByPath) {
     EXPECT_THROW(host.AddTarnFileSystem(name, id, {}, true), HostCtlException) << name;
   }
   EXPECT_EQ(Mounted(host).size(), 1u);
+}
+
+// A mount that is already what was asked for is answered as the existing
+// mount; only a true conflict, or an id that names no container, is refused.
+TEST_F(StorageControl, MountingAgainAnswersTheExistingMountAndRefusesConflicts) {
+  StorageInfoImpl host;
+  std::string sameGold = "6F1C2F4E8D3B4C1A9E2F0A1B2C3D4E5F";
+  std::unique_ptr<TarnFileSystem> again(host.AddTarnFileSystem("gold", sameGold, {}, true));
+  ASSERT_NE(again, nullptr);
+  EXPECT_EQ(again->GetContainerName(), "gold");
+  EXPECT_EQ(again->GetContainerId(), SimTest::kGoldId) << "the existing mount, as it was mounted";
+
+  std::string silver = SimTest::kSilverId;
+  std::string upperGold = "6F1C2F4E-8D3B-4C1A-9E2F-0A1B2C3D4E5F";
+  std::string bad = "Bad CID";
+  const struct {
+    const char* name;
+    std::string* id;
+    std::string refusal;
+  } refused[] = {
+      {"gold", &silver,
+       "A container file system named gold is already mounted at /hyra/volumes/gold"},
+      {"gold-2", &upperGold,
+       "The container 6F1C2F4E-8D3B-4C1A-9E2F-0A1B2C3D4E5F is already mounted as gold at "
+       "/hyra/volumes/gold"},
+      {"odd", &bad, "Cannot mount the container odd: \"Bad CID\" is not a container id"},
+  };
+  for (const auto& c : refused) {
+    EXPECT_EQ(MessageOf([&] { host.AddTarnFileSystem(c.name, *c.id, {}, true); }), c.refusal);
+  }
+  EXPECT_EQ(World()["host"]["mounted"].size(), 1u);
+
+  // Removing by any form of the id takes the one mount.
+  host.RemoveTarnFileSystem("6F1C2F4E8D3B4C1A9E2F0A1B2C3D4E5F");
+  EXPECT_TRUE(World()["host"]["mounted"].empty());
 }
 
 TEST_F(StorageControl, ConfigTarnLifecycle) {
