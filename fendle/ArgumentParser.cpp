@@ -174,10 +174,12 @@ bool ArgumentParser::AsksForHelp(const std::vector<std::string>& words) const {
 }
 
 std::vector<std::string> ArgumentParser::TakeToolOption(std::vector<std::string>& words,
-                                                        const std::string& name) const {
+                                                        const std::string& name,
+                                                        const std::string& alias) const {
   std::vector<std::string> values;
   if (spec_->FindParameter(name)) return values;
   const std::string option = "--" + name;
+  const std::string shortOption = alias.empty() || spec_->FindAlias(alias) ? "" : "-" + alias;
   std::vector<std::size_t> taken;  // indexes of the option's words and values
   ForEachOptionWord(words, [&](std::size_t at) {
     const std::string& word = words[at];
@@ -186,7 +188,7 @@ std::vector<std::string> ArgumentParser::TakeToolOption(std::vector<std::string>
       taken.push_back(at);
       return std::size_t{0};
     }
-    if (word == option) {
+    if (word == option || (!shortOption.empty() && word == shortOption)) {
       if (at + 1 >= words.size() || words[at + 1] == kTerminator) {
         throw UsageError("Option " + option + " needs a value");
       }

@@ -35,12 +35,13 @@ class ArgumentParser {
   // before it ("-v --help" names something --help) or after "--".
   bool AsksForHelp(const std::vector<std::string>& words) const;
 
-  // Removes "--name VALUE" and "--name=VALUE" where an option is expected
-  // and answers the values, in order, for an option the tool offers beside
-  // the command's own; a command that declares name itself keeps it. Throws
-  // UsageError when the value is missing.
+  // Removes "--name VALUE", "--name=VALUE" and "-alias VALUE" where an option
+  // is expected and answers the values, in order, for an option the tool
+  // offers beside the command's own; a command that declares the name (or the
+  // alias) itself keeps it. Throws UsageError when the value is missing.
   std::vector<std::string> TakeToolOption(std::vector<std::string>& words,
-                                          const std::string& name) const;
+                                          const std::string& name,
+                                          const std::string& alias) const;
 
  private:
   // Calls visit(at) for each word at an option's place, up to "--"; visit

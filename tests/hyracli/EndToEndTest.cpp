@@ -73,7 +73,9 @@ TEST_F(EndToEndTest, PluginFailuresExitWithStatusThreeAndSayWhy) {
   EXPECT_EQ(Run({"--plugin-dir", FAILING_PLUGIN_DIR, "storage"}),
             prefix + "Cannot register plug-in " FAILING_PLUGIN_DIR
                      "/failing.plugin.so: Unable to initialize tarnLib "
-                     "(internal/StorageContainerLoad:42)\n");
+                     "(internal/StorageContainerLoad:42)\n"
+                     "hyracli: hint: if the simulated Tarnd is stopped, start it with "
+                     "'hyrasim daemon start'\n");
   // What the failing entry registered was dropped while its code was loaded.
   EXPECT_EQ(Read(dir_ / "trace"), "Leftover destroyed\n");
   EXPECT_EQ(Run({"--plugin-dir", NOENTRY_PLUGIN_DIR}),
@@ -83,7 +85,7 @@ TEST_F(EndToEndTest, PluginFailuresExitWithStatusThreeAndSayWhy) {
       prefix + "Cannot load plug-in " + (dir_ / "junk/broken.plugin.so").string();
   EXPECT_EQ(Run({"--plugin-dir", dir_ / "junk"}).substr(0, junk.size()), junk);
   // Global options are checked before any plug-in is loaded.
-  EXPECT_EQ(Run({"--formatter", "xml", "--plugin-dir", FAILING_PLUGIN_DIR}).substr(0, 4), "2||h");
+  EXPECT_EQ(Run({"--formatter", "yaml", "--plugin-dir", FAILING_PLUGIN_DIR}).substr(0, 4), "2||h");
 }
 
 }  // namespace
