@@ -1,7 +1,8 @@
 #!/usr/bin/env bash
 # Installs the Debian 12 packages the build and the tests need (run as root).
 set -euo pipefail
-packages=(build-essential cmake libboost-dev libsqlite3-dev nlohmann-json3-dev libgtest-dev libgmock-dev)
+packages=(build-essential cmake libboost-dev libsqlite3-dev nlohmann-json3-dev libgtest-dev libgmock-dev
+  python3 libxml2-utils)
 missing=()
 for p in "${packages[@]}"; do
   dpkg-query -W -f='${Status}' "$p" 2>/dev/null | grep -q "install ok installed" || missing+=("$p")
