@@ -1,11 +1,11 @@
 #include "fendle/ArgumentParser.h"
 
-#include "fendle/Text.h"
-
 #include <boost/algorithm/string/predicate.hpp>
 #include <charconv>
 #include <cstdint>
 #include <set>
+
+#include "fendle/Text.h"
 
 namespace Fendle {
 namespace CommandLine {

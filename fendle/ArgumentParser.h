@@ -39,8 +39,7 @@ class ArgumentParser {
   // is expected and answers the values, in order, for an option the tool
   // offers beside the command's own; a command that declares the name (or the
   // alias) itself keeps it. Throws UsageError when the value is missing.
-  std::vector<std::string> TakeToolOption(std::vector<std::string>& words,
-                                          const std::string& name,
+  std::vector<std::string> TakeToolOption(std::vector<std::string>& words, const std::string& name,
                                           const std::string& alias) const;
 
  private:

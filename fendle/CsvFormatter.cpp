@@ -5,10 +5,10 @@
 // record or list is one cell holding its JSON text on one line. A result that
 // is not records has the one column "value". Bytes that are not UTF-8 become
 // U+FFFD.
+#include <sstream>
+
 #include "fendle/Formatter.h"
 #include "fendle/Text.h"
-
-#include <sstream>
 
 namespace Fendle {
 namespace Format {

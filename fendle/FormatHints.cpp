@@ -81,7 +81,7 @@ std::vector<std::string> FormatHints::TableColumns() const {
 }
 
 std::vector<std::string> FormatHints::RecordColumns(const MetaObj::MetaList* list,
-                                                   const MetaStruct* first) const {
+                                                    const MetaStruct* first) const {
   const MetaStruct* model = nullptr;
   if (list != nullptr) model = AsStruct(list->GetPrototype());
   if (model == nullptr) model = AsStruct(prototype_);
@@ -100,8 +100,7 @@ std::vector<std::string> FormatHints::RecordColumns(const MetaObj::MetaList* lis
   return columns;
 }
 
-std::string FormatHints::ColumnTitle(const std::string& structure,
-                                     const std::string& field) const {
+std::string FormatHints::ColumnTitle(const std::string& structure, const std::string& field) const {
   const std::string unit = Unit(structure, field);
   return unit.empty() ? field : field + " (" + unit + ")";
 }

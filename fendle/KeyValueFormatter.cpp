@@ -61,8 +61,8 @@ class KeyValueWriter {
         Value(element, Join(path, std::to_string(index++)));
       }
     } else {
-      out_ << (path.empty() ? std::string("value") : path) << '=' << Escape(ScalarText(value), false)
-           << '\n';
+      out_ << (path.empty() ? std::string("value") : path) << '='
+           << Escape(ScalarText(value), false) << '\n';
     }
   }
 

@@ -1,9 +1,9 @@
 #include "hyracli/HyraCli.h"
 
 #include <algorithm>
+#include <boost/pointer_cast.hpp>
 #include <cerrno>
 #include <cstring>
-#include <boost/pointer_cast.hpp>
 #include <exception>
 #include <sstream>
 
@@ -33,7 +33,8 @@ const char kHelpWord[] = "help";
 // Texts may echo what a user typed or the host stored: control bytes are shown
 // escaped, and a huge text is cut rather than flooding the terminal.
 void WriteMessage(std::ostream& err, const std::string& text) {
-  const std::string shown = Fendle::Text::TerminalSafe(Fendle::Text::Cut(text, Fendle::Text::kMessageLimit));
+  const std::string shown =
+      Fendle::Text::TerminalSafe(Fendle::Text::Cut(text, Fendle::Text::kMessageLimit));
   err << shown;
   if (shown.empty() || shown.back() != '\n') err << '\n';
 }
@@ -43,8 +44,8 @@ std::string CheckFormatter(const std::string& name) {
   if (!Fendle::Format::CreateFormatter(name)) {
     throw UsageError("Unknown formatter " + Fendle::Text::Echo(name) + "; choose " +
                      Fendle::Text::JoinChoices(Fendle::Format::FormatterNames()) +
-                     Fendle::Text::SuggestionText(Fendle::Text::ClosestNames(
-                         name, Fendle::Format::FormatterNames())));
+                     Fendle::Text::SuggestionText(
+                         Fendle::Text::ClosestNames(name, Fendle::Format::FormatterNames())));
   }
   return name;
 }
@@ -235,7 +236,7 @@ GlobalOptions ParseGlobalOptions(const std::vector<std::string>& args) {
     const std::string shown = word == "-o" ? "--formatter" : name;
     if (*given) throw UsageError("Option " + shown + " is given more than once");
     *given = true;
-    if (equals != std::string::npos && word != "-o") {
+    if (equals != std::string::npos) {
       *target = word.substr(equals + 1);
     } else if (at + 1 < args.size()) {
       *target = args[++at];
@@ -320,10 +321,10 @@ int Dispatch(const GlobalOptions& options, const boost::shared_ptr<NamespaceNode
   if (!words.empty()) {
     const std::string where = CommandLineOf(*node);
     if (words.front()[0] == '-') {
-      return ReportUsage(err,
-                         "'" + where + "' is a namespace and takes no option " +
-                             Fendle::Text::Echo(words.front()),
-                         where);
+      return ReportUsage(
+          err,
+          "'" + where + "' is a namespace and takes no option " + Fendle::Text::Echo(words.front()),
+          where);
     }
     return ReportUsage(err,
                        "Unknown namespace or command " + Fendle::Text::Echo(words.front()) +
@@ -339,8 +340,7 @@ int Dispatch(const GlobalOptions& options, const boost::shared_ptr<NamespaceNode
 void WriteVersions(const std::vector<PluginVersion>& plugins, std::ostream& out) {
   out << kTool << " " << HYRA_VERSION << "\n";
   for (const PluginVersion& plugin : plugins) {
-    out << plugin.name << " " << (plugin.version.empty() ? "(no version)" : plugin.version)
-        << "\n";
+    out << plugin.name << " " << (plugin.version.empty() ? "(no version)" : plugin.version) << "\n";
   }
 }
 

@@ -4,8 +4,8 @@
 #include <link.h>
 
 #include <algorithm>
-#include <cstring>
 #include <cstdlib>
+#include <cstring>
 #include <filesystem>
 #include <system_error>
 
@@ -96,8 +96,8 @@ void PluginLoader::Load(const std::string& path,
   // throws, may hold code of this library.
   handles_.push_back(std::move(handle));
   Register(reinterpret_cast<RegisterEntry>(symbol), path, root);
-  versions_.push_back({std::filesystem::path(path).filename().string(),
-                       LoadedVersion(handles_.back().get())});
+  versions_.push_back(
+      {std::filesystem::path(path).filename().string(), LoadedVersion(handles_.back().get())});
 }
 
 const std::vector<PluginVersion>& PluginLoader::Versions() const { return versions_; }

@@ -71,8 +71,9 @@ TEST(ArgumentParserTest, RefusesWhatTheCommandCouldNotRunWith) {
       {{"-n", "x", "--zzzzzz"}, "Unknown option '--zzzzzz'"},
       // An echoed value is cut and its control bytes are shown escaped.
       {{"-n", "x", "-t", std::string(300, 'x') + "\x1B"},
-       "Value '" + std::string(256, 'x') + "... (cut, 301 bytes in all)' of option --count is "
-       "not an integer"},
+       "Value '" + std::string(256, 'x') +
+           "... (cut, 301 bytes in all)' of option --count is "
+           "not an integer"},
       {{"-n", "x", "-t", "1\x1B[2J"}, "Value '1\\x1B[2J' of option --count is not an integer"},
       {{"--name"}, "Option --name needs a value"},
       {{"-n", "x", "-t"}, "Option --count needs a value"},

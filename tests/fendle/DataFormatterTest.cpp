@@ -128,16 +128,18 @@ TEST_F(ParsedBackTest, CsvReadsBackRowForRowWithNestedValuesAsJson) {
   EXPECT_EQ(csv.substr(0, csv.find('\n') + 1),
             "Max Tarn Size (MB) (MB),StorageContainer Name,Arrays,Ok\r\n");
   const std::string read = Through(
-      csv, "python3 -c 'import csv,json,sys; "
-           "print(json.dumps(list(csv.reader(open(sys.argv[1], newline=\"\", encoding=\"utf-8\"), "
-           "strict=True))))' {}");
-  EXPECT_EQ(read,
-            "[[\"Max Tarn Size (MB) (MB)\", \"StorageContainer Name\", \"Arrays\", \"Ok\"], "
-            "[\"-9223372036854775808\", \"a,b \\\"q\\\"\\nline2\\r\\n<&>\", "
-            "\"[{\\\"ArrayId\\\":\\\"A.1=x\\\",\\\"PEInfo\\\":[\\\"pe 1\\\",\\\"pe\\\\\\\\2\\\"]}]\", "
-            "\"true\"], [\"10240\", \"esc\\u001b[31m tab\\t bad\\ufffd\\ufffd ok\\u00e4 "
-            "nonchar\\ufffe\", \"[{\\\"ArrayId\\\":\\\"A.1=x\\\",\\\"PEInfo\\\":[\\\"pe 1\\\","
-            "\\\"pe\\\\\\\\2\\\"]}]\", \"true\"]]\n");
+      csv,
+      "python3 -c 'import csv,json,sys; "
+      "print(json.dumps(list(csv.reader(open(sys.argv[1], newline=\"\", encoding=\"utf-8\"), "
+      "strict=True))))' {}");
+  EXPECT_EQ(
+      read,
+      "[[\"Max Tarn Size (MB) (MB)\", \"StorageContainer Name\", \"Arrays\", \"Ok\"], "
+      "[\"-9223372036854775808\", \"a,b \\\"q\\\"\\nline2\\r\\n<&>\", "
+      "\"[{\\\"ArrayId\\\":\\\"A.1=x\\\",\\\"PEInfo\\\":[\\\"pe 1\\\",\\\"pe\\\\\\\\2\\\"]}]\", "
+      "\"true\"], [\"10240\", \"esc\\u001b[31m tab\\t bad\\ufffd\\ufffd ok\\u00e4 "
+      "nonchar\\ufffe\", \"[{\\\"ArrayId\\\":\\\"A.1=x\\\",\\\"PEInfo\\\":[\\\"pe 1\\\","
+      "\\\"pe\\\\\\\\2\\\"]}]\", \"true\"]]\n");
   // Results that are not records have one column; an empty list of records
   // still names its columns.
   auto prototype = MetaStruct::New("Row");
@@ -178,16 +180,20 @@ Value RandomValue(std::mt19937& random, int depth) {
     std::string bytes;
     const int length = static_cast<int>(random() % 8);
     for (int i = 0; i < length; ++i) {
-      const char pool[] = {'a', '"', '\\', '\n', '\x01', '\x7F', '\xC3', '\xA4', '\xE2', '\x82',
-                           '\xAC', '\xF0', '\x9F', '\x98', '\x80', '\xFF', '\xED', '\xA0', '\xC0'};
+      const char pool[] = {'a',    '"',    '\\',   '\n',   '\x01', '\x7F', '\xC3',
+                           '\xA4', '\xE2', '\x82', '\xAC', '\xF0', '\x9F', '\x98',
+                           '\x80', '\xFF', '\xED', '\xA0', '\xC0'};
       bytes += pool[random() % sizeof pool];
     }
     return bytes;
   };
   switch (depth > 2 ? random() % 3 : random() % 5) {
-    case 0: return MetaString::New(text());
-    case 1: return MetaInt::New(static_cast<int64_t>(random()) - (int64_t{1} << 31));
-    case 2: return MetaBool::New(random() % 2 == 0);
+    case 0:
+      return MetaString::New(text());
+    case 1:
+      return MetaInt::New(static_cast<int64_t>(random()) - (int64_t{1} << 31));
+    case 2:
+      return MetaBool::New(random() % 2 == 0);
     case 3: {
       auto record = MetaStruct::New("R");
       for (int i = static_cast<int>(random() % 4); i > 0; --i) {
@@ -201,7 +207,8 @@ Value RandomValue(std::mt19937& random, int depth) {
     }
     default: {
       auto list = MetaList::New(MetaType::List);
-      for (int i = static_cast<int>(random() % 4); i > 0; --i) list->Append(RandomValue(random, depth + 1));
+      for (int i = static_cast<int>(random() % 4); i > 0; --i)
+        list->Append(RandomValue(random, depth + 1));
       return list;
     }
   }

@@ -147,9 +147,9 @@ TEST(FormatterTest, ControlBytesFromTheHostReachTheTerminalEscaped) {
   row->SetField("Name", "a\x1B[2Jb\tc\rd\xC2\x9B\xFF\xC3\xA4\x7F");
   EXPECT_EQ(Render("simple", row), "R\n  Name: a\\x1B[2Jb\tc\\x0Dd\\xC2\\x9B\\xFF\xC3\xA4\\x7F\n");
   // In a table a tab would break the columns.
-  EXPECT_EQ(Render("table", row),
-            "Name\n" + std::string(36, '-') + "\n"
-            "a\\x1B[2Jb\\x09c\\x0Dd\\xC2\\x9B\\xFF\xC3\xA4\\x7F\n");
+  EXPECT_EQ(Render("table", row), "Name\n" + std::string(36, '-') +
+                                      "\n"
+                                      "a\\x1B[2Jb\\x09c\\x0Dd\\xC2\\x9B\\xFF\xC3\xA4\\x7F\n");
   EXPECT_EQ(Render("simple", MetaString::New("ok\x07\n")), "ok\\x07\n");
 }
 

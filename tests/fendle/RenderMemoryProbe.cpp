@@ -45,7 +45,8 @@ boost::shared_ptr<MetaList> LoadResult(int rows) {
   for (int n = 0; n < rows; ++n) {
     auto row = RowPrototype();
     row->SetField("StorageContainer Name", "ds" + std::to_string(n));
-    row->SetField("StorageContainer Id", "6f1c2f4e-8d3b-4c1a-9e2f-" + std::to_string(100000000000 + n));
+    row->SetField("StorageContainer Id",
+                  "6f1c2f4e-8d3b-4c1a-9e2f-" + std::to_string(100000000000 + n));
     row->SetField("Max Tarn Size (MB)", int64_t{2097152});
     row->SetField("VP URL", "https://vp1.example.test:8443/kiro");
     auto arrays = MetaList::New(MetaType::Struct, ArrayPrototype());
@@ -57,9 +58,10 @@ boost::shared_ptr<MetaList> LoadResult(int rows) {
       array->SetField("Model Id", "M100");
       std::vector<std::string> endpoints;
       for (int pe = 0; pe < 4; ++pe) {
-        endpoints.push_back("PE #" + std::to_string(pe) + " (localUID: pe-" + id + std::to_string(pe) +
-                            ", isAccessible: 1, isConfigured: 1, type: NFS, ipAddress: 192.0.2." +
-                            std::to_string(pe) + ", serverMount: /exports/x" + std::to_string(pe) + ")");
+        endpoints.push_back(
+            "PE #" + std::to_string(pe) + " (localUID: pe-" + id + std::to_string(pe) +
+            ", isAccessible: 1, isConfigured: 1, type: NFS, ipAddress: 192.0.2." +
+            std::to_string(pe) + ", serverMount: /exports/x" + std::to_string(pe) + ")");
       }
       array->SetField("PEInfo", endpoints);
       arrays->Append(array);
@@ -85,7 +87,8 @@ int main(int argc, char** argv) {
   const Fendle::Format::FormatHints hints(
       {{"header:StorageContainer", "%StorageContainer Name%"},
        {"header:Array", "%ArrayId%"},
-       {"table-columns", "StorageContainer Name,StorageContainer Id,Max Tarn Size (MB),VP URL,Arrays"}},
+       {"table-columns",
+        "StorageContainer Name,StorageContainer Id,Max Tarn Size (MB),VP URL,Arrays"}},
       result);
   auto formatter = Fendle::Format::CreateFormatter(argv[1]);
   if (!formatter) return 2;

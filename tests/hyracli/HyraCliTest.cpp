@@ -157,7 +157,8 @@ TEST_F(HyraCliTest, GlobalOptionsHelpWordsAndTheTerminatorWhereverUsersPutThem) 
        "2||hyracli: Option --formatter is given more than once" + actUsage},
       {{"storage", "test", "act", "-d", "x", "--formatter", "jsno"},
        "2||hyracli: Unknown formatter 'jsno'; choose simple, table, json, xml, csv or keyvalue\n"
-       "Did you mean 'json'?" + actUsage},
+       "Did you mean 'json'?" +
+           actUsage},
       // Help by -h and by the word help, before the words or after a namespace.
       {{"storage", "test", "act", "-h"}, std::string("0|") + kActHelp + "|"},
       {{"help", "storage", "test", "act"}, std::string("0|") + kActHelp + "|"},
@@ -187,7 +188,9 @@ TEST_F(HyraCliTest, GlobalOptionsHelpWordsAndTheTerminatorWhereverUsersPutThem) 
 
 TEST_F(HyraCliTest, TextsForTheTerminalAreEscapedAndHugeErrorsCut) {
   // A result and an error that carry terminal escape sequences.
-  EXPECT_EQ(RunTool(root_, {"storage", "test", "act", "-d", "a\x1B]0;owned\x07" "b"}),
+  EXPECT_EQ(RunTool(root_, {"storage", "test", "act", "-d",
+                            "a\x1B]0;owned\x07"
+                            "b"}),
             "0|a\\x1B]0;owned\\x07b\n|");
   EXPECT_EQ(RunTool(root_, {"storage", "test", "act", "-d", "err:bad \x1B[2J\r"}),
             "1||bad \\x1B[2J\\x0D\n");

@@ -85,8 +85,8 @@ TEST_F(CliTest, StoppedDaemonStillAnswersHelpAndSaysHowToStartIt) {
 TEST_F(CliTest, OutputThatCannotBeWrittenFailsTheRun) {
   const std::string err = directory_ + "/err";
   const std::string command = std::string("'") + HYRACLI_PATH +
-                              "' storage internal tarn storagecontainer load >/dev/full 2>'" +
-                              err + "'";
+                              "' storage internal tarn storagecontainer load >/dev/full 2>'" + err +
+                              "'";
   const int raw = std::system(command.c_str());
   std::stringstream text;
   text << std::ifstream(err).rdbuf();
