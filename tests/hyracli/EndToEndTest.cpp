@@ -88,4 +88,17 @@ TEST_F(EndToEndTest, PluginFailuresExitWithStatusThreeAndSayWhy) {
   EXPECT_EQ(Run({"--formatter", "yaml", "--plugin-dir", FAILING_PLUGIN_DIR}).substr(0, 4), "2||h");
 }
 
+TEST_F(EndToEndTest, VersionsAndAnEmptyPluginDirectoryAreReported) {
+  // Plug-ins built without a version note are still listed.
+  EXPECT_EQ(Run({"--version", "--plugin-dir", GOOD_PLUGIN_DIR}),
+            std::string("0|hyracli ") + HYRA_VERSION +
+                "\n10-first.plugin.so (no version)\n20-second.plugin.so (no version)\n|");
+  fs::create_directories(dir_ / "empty");
+  EXPECT_EQ(Run({"--plugin-dir", dir_ / "empty", "storage", "internal"}),
+            "2||hyracli: Unknown namespace or command 'internal' in 'hyracli storage'\n"
+            "Run 'hyracli storage --help' for help.\n"
+            "hyracli: no plug-in was loaded from " +
+                (dir_ / "empty").string() + " (plug-ins are its *.plugin.so files)\n");
+}
+
 }  // namespace
