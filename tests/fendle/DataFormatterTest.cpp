@@ -197,7 +197,7 @@ Value RandomValue(std::mt19937& random, int depth) {
     case 3: {
       auto record = MetaStruct::New("R");
       for (int i = static_cast<int>(random() % 4); i > 0; --i) {
-        record->SetField(text(), boost::static_pointer_cast<MetaString>(RandomValue(random, 3)));
+        record->SetField(text(), MetaString::New(text()));
         record->SetField("n" + std::to_string(i), MetaInt::New(i));
       }
       auto inner = MetaList::New(MetaType::List);
