@@ -5,6 +5,8 @@
 #include <cstdint>
 #include <set>
 
+#include "fendle/Text.h"
+
 namespace Fendle {
 namespace CommandLine {
 
@@ -17,7 +19,25 @@ UsageError::~UsageError() = default;
 
 namespace {
 
+using Text::Echo;
+
 std::string OptionName(const ParameterSpec& parameter) { return "--" + parameter.GetName(); }
+
+const char kTerminator[] = "--";
+
+// "Unknown option" with the closest long names, for a long option only: one
+// letter is too little to guess from.
+[[noreturn]] void RefuseUnknown(const std::string& word, const CallSpec::InputSpec& spec) {
+  std::string text = "Unknown option " + Echo(word);
+  if (word.compare(0, 2, "--") == 0) {
+    std::vector<std::string> names;
+    for (const auto& parameter : spec.GetParameters()) names.push_back(parameter->GetName());
+    std::vector<std::string> closest = Text::ClosestNames(word.substr(2), names);
+    for (std::string& name : closest) name = "--" + name;
+    text += Text::SuggestionText(closest);
+  }
+  throw UsageError(text);
+}
 
 bool IsList(ParameterType type) {
   return type == ParameterType::StringList || type == ParameterType::IntList ||
@@ -33,11 +53,11 @@ int64_t ParseInt(const ParameterSpec& parameter, const std::string& text) {
   int64_t value = 0;
   std::from_chars_result parsed = std::from_chars(begin, end, value, 10);
   if (parsed.ec == std::errc::result_out_of_range) {
-    throw UsageError("Value '" + text + "' of option " + OptionName(parameter) +
+    throw UsageError("Value " + Echo(text) + " of option " + OptionName(parameter) +
                      " is out of range for a 64-bit integer");
   }
   if (parsed.ec != std::errc() || parsed.ptr != end) {
-    throw UsageError("Value '" + text + "' of option " + OptionName(parameter) +
+    throw UsageError("Value " + Echo(text) + " of option " + OptionName(parameter) +
                      " is not an integer");
   }
   return value;
@@ -50,7 +70,7 @@ bool ParseBool(const ParameterSpec& parameter, const std::string& text) {
   for (const char* word : {"false", "0", "no"}) {
     if (boost::algorithm::iequals(text, word)) return false;
   }
-  throw UsageError("Value '" + text + "' of option " + OptionName(parameter) +
+  throw UsageError("Value " + Echo(text) + " of option " + OptionName(parameter) +
                    " must be true or false");
 }
 
@@ -65,6 +85,10 @@ boost::shared_ptr<CallSpec::Input> ArgumentParser::Parse(
   std::set<std::string> given;
   for (std::size_t at = 0; at < words.size(); ++at) {
     const std::string& word = words[at];
+    if (word == kTerminator) {
+      if (at + 1 < words.size()) throw UsageError("Unexpected argument " + Echo(words[at + 1]));
+      break;
+    }
     boost::shared_ptr<ParameterSpec> parameter;
     bool inline_value = false;
     std::string value;
@@ -76,12 +100,12 @@ boost::shared_ptr<CallSpec::Input> ArgumentParser::Parse(
         value = word.substr(equals + 1);
       }
       parameter = spec_->FindParameter(name);
-      if (!parameter) throw UsageError("Unknown option '--" + name + "'");
+      if (!parameter) RefuseUnknown("--" + name, *spec_);
     } else if (word.size() > 1 && word[0] == '-' && word[1] != '-') {
       parameter = spec_->FindAlias(word.substr(1));
-      if (!parameter) throw UsageError("Unknown option '" + word + "'");
+      if (!parameter) RefuseUnknown(word, *spec_);
     } else {
-      throw UsageError("Unexpected argument '" + word + "'");
+      throw UsageError("Unexpected argument " + Echo(word));
     }
 
     const ParameterType type = parameter->GetType();
@@ -113,20 +137,72 @@ boost::shared_ptr<CallSpec::Input> ArgumentParser::Parse(
   return input;
 }
 
-bool ArgumentParser::AsksForHelp(const std::vector<std::string>& words) const {
+boost::shared_ptr<ParameterSpec> ArgumentParser::Named(const std::string& word) const {
+  if (word.size() > 2 && word.compare(0, 2, "--") == 0) {
+    if (word.find('=') != std::string::npos) return nullptr;
+    return spec_->FindParameter(word.substr(2));
+  }
+  if (word.size() > 1 && word[0] == '-' && word[1] != '-') return spec_->FindAlias(word.substr(1));
+  return nullptr;
+}
+
+template <typename Visit>
+std::size_t ArgumentParser::ForEachOptionWord(const std::vector<std::string>& words,
+                                              Visit visit) const {
   for (std::size_t at = 0; at < words.size(); ++at) {
-    const std::string& word = words[at];
-    if (word == "--help") return true;
-    boost::shared_ptr<ParameterSpec> parameter;
-    if (word.size() > 2 && word.compare(0, 2, "--") == 0) {
-      if (word.find('=') != std::string::npos) continue;
-      parameter = spec_->FindParameter(word.substr(2));
-    } else if (word.size() > 1 && word[0] == '-' && word[1] != '-') {
-      parameter = spec_->FindAlias(word.substr(1));
+    if (words[at] == kTerminator) return at;
+    // The visitor answers how many words it used beyond this one.
+    const std::size_t used = visit(at);
+    if (used > 0) {
+      at += used;
+      continue;
     }
+    boost::shared_ptr<ParameterSpec> parameter = Named(words[at]);
     if (parameter && parameter->GetType() != ParameterType::Flag) ++at;  // skip its value
   }
-  return false;
+  return words.size();
+}
+
+bool ArgumentParser::AsksForHelp(const std::vector<std::string>& words) const {
+  const bool shortHelp = !spec_->FindAlias("h");
+  bool asks = false;
+  ForEachOptionWord(words, [&](std::size_t at) {
+    asks = asks || words[at] == "--help" || (shortHelp && words[at] == "-h");
+    return std::size_t{0};
+  });
+  return asks;
+}
+
+std::vector<std::string> ArgumentParser::TakeToolOption(std::vector<std::string>& words,
+                                                        const std::string& name,
+                                                        const std::string& alias) const {
+  std::vector<std::string> values;
+  if (spec_->FindParameter(name)) return values;
+  const std::string option = "--" + name;
+  const std::string shortOption = alias.empty() || spec_->FindAlias(alias) ? "" : "-" + alias;
+  std::vector<std::size_t> taken;  // indexes of the option's words and values
+  ForEachOptionWord(words, [&](std::size_t at) {
+    const std::string& word = words[at];
+    if (word.compare(0, option.size() + 1, option + "=") == 0) {
+      values.push_back(word.substr(option.size() + 1));
+      taken.push_back(at);
+      return std::size_t{0};
+    }
+    if (word == option || (!shortOption.empty() && word == shortOption)) {
+      if (at + 1 >= words.size() || words[at + 1] == kTerminator) {
+        throw UsageError("Option " + option + " needs a value");
+      }
+      values.push_back(words[at + 1]);
+      taken.push_back(at);
+      taken.push_back(at + 1);
+      return std::size_t{1};
+    }
+    return std::size_t{0};
+  });
+  for (auto index = taken.rbegin(); index != taken.rend(); ++index) {
+    words.erase(words.begin() + static_cast<std::ptrdiff_t>(*index));
+  }
+  return values;
 }
 
 void ArgumentParser::Store(const ParameterSpec& parameter, const std::string& value,

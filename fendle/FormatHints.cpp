@@ -1,5 +1,7 @@
 #include "fendle/FormatHints.h"
 
+#include <algorithm>
+
 namespace Fendle {
 namespace Format {
 
@@ -30,6 +32,8 @@ std::vector<std::string> FormatHints::DisplayFields(const MetaStruct& record) co
     return fields;
   }
   for (const std::string& name : listed) {
+    // A field listed twice is shown once: a document must not repeat a key.
+    if (std::find(fields.begin(), fields.end(), name) != fields.end()) continue;
     for (const auto& field : record.GetFields()) {
       if (field.first == name) {
         fields.push_back(name);
@@ -74,6 +78,31 @@ std::string FormatHints::Unit(const std::string& structure, const std::string& f
 
 std::vector<std::string> FormatHints::TableColumns() const {
   return SplitList(Get("table-columns"));
+}
+
+std::vector<std::string> FormatHints::RecordColumns(const MetaObj::MetaList* list,
+                                                    const MetaStruct* first) const {
+  const MetaStruct* model = nullptr;
+  if (list != nullptr) model = AsStruct(list->GetPrototype());
+  if (model == nullptr) model = AsStruct(prototype_);
+  if (model == nullptr) {
+    if (const MetaObj::MetaList* declared = AsList(prototype_)) {
+      model = AsStruct(declared->GetPrototype());
+    }
+  }
+  if (model == nullptr) model = first;
+  std::vector<std::string> columns;
+  if (model != nullptr) columns = ListedFields(model->GetName());
+  if (columns.empty()) columns = TableColumns();
+  if (columns.empty() && model != nullptr) {
+    for (const auto& field : model->GetFields()) columns.push_back(field.first);
+  }
+  return columns;
+}
+
+std::string FormatHints::ColumnTitle(const std::string& structure, const std::string& field) const {
+  const std::string unit = Unit(structure, field);
+  return unit.empty() ? field : field + " (" + unit + ")";
 }
 
 std::vector<std::string> SplitList(const std::string& text) {

@@ -42,6 +42,14 @@ class FormatHints {
   std::string Unit(const std::string& structure, const std::string& field) const;
   // The "table-columns" hint split at commas; empty without one.
   std::vector<std::string> TableColumns() const;
+  // The columns of a table of records: the "fields:" hint of the structure
+  // that stands for every row (the list's element prototype, else the declared
+  // result's, else first), else the "table-columns" hint, else that
+  // structure's fields. list and first may be null.
+  std::vector<std::string> RecordColumns(const MetaObj::MetaList* list,
+                                         const MetaObj::MetaStruct* first) const;
+  // A column's title with its unit: "Size (MB)", or the name alone.
+  std::string ColumnTitle(const std::string& structure, const std::string& field) const;
 
  private:
   Pairs parameters_;

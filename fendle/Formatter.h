@@ -1,5 +1,7 @@
-// Renders a command's result for the user: "simple" (indented records),
-// "table" (aligned columns) or "json" (for scripts).
+// Renders a command's result: for people "simple" (indented records) and
+// "table" (aligned columns); for programs "json", "xml", "csv" and "keyvalue".
+// Every formatter writes straight to its stream as it walks the value, so the
+// output is never held whole in memory.
 #pragma once
 
 #include <boost/shared_ptr.hpp>
@@ -45,10 +47,46 @@ class JsonFormatter : public Formatter {
               std::ostream& out) const override;
 };
 
-// The formatter of that name, or null when there is none.
+// The result as one XML 1.0 document (see XmlFormatter.cpp for its shape).
+class XmlFormatter : public Formatter {
+ public:
+  void Render(const boost::shared_ptr<MetaObj::MetaObject>& result, const FormatHints& hints,
+              std::ostream& out) const override;
+};
+
+// The result as RFC 4180 CSV: a header row, then one row per record.
+class CsvFormatter : public Formatter {
+ public:
+  void Render(const boost::shared_ptr<MetaObj::MetaObject>& result, const FormatHints& hints,
+              std::ostream& out) const override;
+};
+
+// One "path.to.field=value" line per leaf of the result.
+class KeyValueFormatter : public Formatter {
+ public:
+  void Render(const boost::shared_ptr<MetaObj::MetaObject>& result, const FormatHints& hints,
+              std::ostream& out) const override;
+};
+
+// One formatter the tool offers: its name, a line for help texts, its maker.
+struct FormatterEntry {
+  const char* name;
+  const char* summary;
+  std::unique_ptr<Formatter> (*create)();
+};
+
+// Every formatter, in the order help texts list them. The tool's help, its
+// error texts and anything generated from the tool read the names from here.
+const std::vector<FormatterEntry>& Formatters();
+// The formatter of that name in any case, or null when there is none.
 std::unique_ptr<Formatter> CreateFormatter(const std::string& name);
-// The names CreateFormatter knows.
+// The names of Formatters(), in order.
 const std::vector<std::string>& FormatterNames();
+
+// Writes value as JSON text: indented by indent blanks per level, or on one
+// line without blanks when indent is negative.
+void WriteJson(const boost::shared_ptr<MetaObj::MetaObject>& value, const FormatHints& hints,
+               int indent, std::ostream& out);
 
 }  // namespace Format
 }  // namespace Fendle

@@ -5,6 +5,15 @@ namespace MetaObj {
 
 namespace {
 
+// Records have a handful of fields and most lists few elements, while a result
+// may hold thousands of them: growing one slot at a time up to eight, then by
+// doubling, keeps a small vector from carrying unused slots.
+template <typename Vector>
+void Grow(Vector& vector) {
+  if (vector.size() < vector.capacity()) return;
+  vector.reserve(vector.size() < 8 ? vector.size() + 1 : vector.size() * 2);
+}
+
 // Deep copy that tolerates an empty pointer, which a caller may have stored.
 boost::shared_ptr<MetaObject> CloneOrEmpty(const boost::shared_ptr<MetaObject>& value) {
   return value ? value->Clone() : boost::shared_ptr<MetaObject>();
@@ -146,6 +155,7 @@ void MetaStruct::Put(const std::string& field, const boost::shared_ptr<MetaObjec
       return;
     }
   }
+  Grow(fields_);
   fields_.emplace_back(field, value);
 }
 
@@ -177,6 +187,7 @@ MetaType MetaList::GetElementType() const { return elementType_; }
 boost::shared_ptr<MetaObject> MetaList::GetPrototype() const { return prototype_; }
 
 void MetaList::Append(const boost::shared_ptr<MetaObject>& element) {
+  Grow(elements_);
   elements_.push_back(element);
 }
 

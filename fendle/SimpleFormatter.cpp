@@ -1,4 +1,5 @@
 #include "fendle/Formatter.h"
+#include "fendle/Text.h"
 
 namespace Fendle {
 namespace Format {
@@ -53,9 +54,11 @@ class SimpleWriter {
     Line(indent, text.empty() ? name + ":" : name + ": " + text);
   }
 
-  // One line at indent; a text of several lines keeps its later lines under the first.
+  // One line at indent; a text of several lines keeps its later lines under the
+  // first. Control bytes are shown escaped: they come from the host and must
+  // not drive the user's terminal.
   void Line(int indent, const std::string& text) {
-    std::string body = text;
+    std::string body = Text::TerminalSafe(text);
     if (!body.empty() && body.back() == '\n') body.pop_back();
     if (body.empty()) {
       out_ << '\n';
@@ -86,7 +89,7 @@ void SimpleFormatter::Render(const boost::shared_ptr<MetaObject>& result, const 
     writer.Elements(*list, 0);
   } else {
     // A text result is the command's own wording: written as is, ended once.
-    std::string text = ScalarText(result);
+    std::string text = Text::TerminalSafe(ScalarText(result));
     out << text;
     if (text.empty() || text.back() != '\n') out << '\n';
   }

@@ -1,6 +1,7 @@
 #include <algorithm>
 
 #include "fendle/Formatter.h"
+#include "fendle/Text.h"
 
 namespace Fendle {
 namespace Format {
@@ -20,11 +21,12 @@ std::size_t DisplayWidth(const std::string& text) {
   }));
 }
 
-// A value on one line: line feeds become blanks, a final one is dropped.
+// A value on one line: line feeds become blanks, a final one is dropped, and
+// control bytes (tab included, it would break the columns) are shown escaped.
 std::string OneLine(std::string text) {
   if (!text.empty() && text.back() == '\n') text.pop_back();
   std::replace(text.begin(), text.end(), '\n', ' ');
-  return text;
+  return Text::TerminalSafe(text, false);
 }
 
 // A nested value in one cell: a record by its heading hint (else its fields in
@@ -70,30 +72,6 @@ void WriteRow(const std::vector<std::string>& cells, const std::vector<std::size
   out << '\n';
 }
 
-// The structure that stands for every row: the list's element prototype, the
-// declared result's, or the first row.
-const MetaStruct* ModelRow(const MetaList* list, const std::vector<const MetaStruct*>& rows,
-                           const FormatHints& hints) {
-  if (list != nullptr) {
-    if (const MetaStruct* model = AsStruct(list->GetPrototype())) return model;
-  }
-  if (const MetaStruct* declared = AsStruct(hints.Prototype())) return declared;
-  if (const MetaList* declared = AsList(hints.Prototype())) {
-    if (const MetaStruct* model = AsStruct(declared->GetPrototype())) return model;
-  }
-  return rows.empty() ? nullptr : rows.front();
-}
-
-std::vector<std::string> Columns(const MetaStruct* model, const FormatHints& hints) {
-  std::vector<std::string> columns;
-  if (model != nullptr) columns = hints.ListedFields(model->GetName());
-  if (columns.empty()) columns = hints.TableColumns();
-  if (columns.empty() && model != nullptr) {
-    for (const auto& field : model->GetFields()) columns.push_back(field.first);
-  }
-  return columns;
-}
-
 }  // namespace
 
 void TableFormatter::Render(const boost::shared_ptr<MetaObject>& result, const FormatHints& hints,
@@ -117,24 +95,27 @@ void TableFormatter::Render(const boost::shared_ptr<MetaObject>& result, const F
     return;
   }
 
-  std::vector<std::string> columns = Columns(ModelRow(list, rows, hints), hints);
+  std::vector<std::string> columns =
+      hints.RecordColumns(list, rows.empty() ? nullptr : rows.front());
   if (columns.empty()) return;
-  std::vector<std::vector<std::string> > cells;
+  // Two passes, measuring then writing, so no cell is held beyond its row.
   std::vector<std::size_t> widths;
-  for (const std::string& column : columns) widths.push_back(DisplayWidth(column));
+  for (const std::string& column : columns) widths.push_back(DisplayWidth(OneLine(column)));
+  std::vector<std::string> line(columns.size());
   for (const MetaStruct* row : rows) {
-    std::vector<std::string> line;
     for (std::size_t i = 0; i < columns.size(); ++i) {
-      line.push_back(Cell(*row, columns[i], hints));
-      widths[i] = std::max(widths[i], DisplayWidth(line.back()));
+      widths[i] = std::max(widths[i], DisplayWidth(Cell(*row, columns[i], hints)));
     }
-    cells.push_back(line);
   }
   std::vector<std::string> dashes;
   for (std::size_t width : widths) dashes.push_back(std::string(width, '-'));
+  for (std::string& column : columns) column = OneLine(column);
   WriteRow(columns, widths, out);
   WriteRow(dashes, widths, out);
-  for (const auto& line : cells) WriteRow(line, widths, out);
+  for (const MetaStruct* row : rows) {
+    for (std::size_t i = 0; i < columns.size(); ++i) line[i] = Cell(*row, columns[i], hints);
+    WriteRow(line, widths, out);
+  }
 }
 
 }  // namespace Format

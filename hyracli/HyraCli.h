@@ -8,6 +8,7 @@
 #include <vector>
 
 #include "Fendle/AutoCli.h"
+#include "hyracli/PluginLoader.h"
 
 namespace Hyracli {
 
@@ -19,17 +20,21 @@ enum ExitStatus : int {
   kExitPlugin = 3,         // a plug-in could not be loaded or registered
 };
 
-// The options before the command words.
+// The options before the command words (--formatter may also follow them).
 struct GlobalOptions {
   std::string formatter;        // empty: the command's default
   std::string pluginDirectory;  // empty: not given
   bool help = false;
+  bool version = false;
   std::vector<std::string> words;  // the command words and the command's own arguments
 };
 
 // Throws Fendle::CommandLine::UsageError for an unknown or repeated option, a
-// missing value or an unknown formatter.
+// missing value or an unknown formatter. A first word "help" asks for help.
 GlobalOptions ParseGlobalOptions(const std::vector<std::string>& args);
+
+// The tool's version line, then one line per plug-in: file name and version.
+void WriteVersions(const std::vector<PluginVersion>& plugins, std::ostream& out);
 
 // The tool's own tree: the root "hyracli" holding an empty "storage".
 boost::shared_ptr<Fendle::AutoCli::Namespace> NewRootNamespace();
@@ -46,6 +51,7 @@ int Run(const std::vector<std::string>& args,
         std::ostream& err);
 
 // The whole tool: options, plug-ins, then Dispatch on the tool's own tree.
+// Output that cannot be written (a full disk) fails the run with a message.
 int Main(const std::vector<std::string>& args, std::ostream& out, std::ostream& err);
 
 }  // namespace Hyracli

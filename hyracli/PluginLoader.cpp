@@ -1,9 +1,11 @@
 #include "hyracli/PluginLoader.h"
 
 #include <dlfcn.h>
+#include <link.h>
 
 #include <algorithm>
 #include <cstdlib>
+#include <cstring>
 #include <filesystem>
 #include <system_error>
 
@@ -94,6 +96,65 @@ void PluginLoader::Load(const std::string& path,
   // throws, may hold code of this library.
   handles_.push_back(std::move(handle));
   Register(reinterpret_cast<RegisterEntry>(symbol), path, root);
+  versions_.push_back(
+      {std::filesystem::path(path).filename().string(), LoadedVersion(handles_.back().get())});
+}
+
+const std::vector<PluginVersion>& PluginLoader::Versions() const { return versions_; }
+
+namespace {
+
+const char kNoteName[] = "Hyracli";
+constexpr ElfW(Word) kVersionNote = 1;
+
+std::size_t Aligned(std::size_t size) { return (size + 3) / 4 * 4; }
+
+// The version text in a block of notes, or empty. Sizes are checked against
+// the block, so a malformed note ends the search instead of reading past it.
+std::string FindVersion(const char* notes, std::size_t size) {
+  std::size_t at = 0;
+  while (size - at >= sizeof(ElfW(Nhdr))) {
+    ElfW(Nhdr) header;
+    std::memcpy(&header, notes + at, sizeof header);
+    at += sizeof header;
+    const std::size_t name = Aligned(header.n_namesz), desc = Aligned(header.n_descsz);
+    if (name > size - at || desc > size - at - name) return std::string();
+    if (header.n_type == kVersionNote && header.n_namesz == sizeof(kNoteName) &&
+        std::memcmp(notes + at, kNoteName, sizeof(kNoteName)) == 0) {
+      const char* text = notes + at + name;
+      return std::string(text, strnlen(text, header.n_descsz));
+    }
+    at += name + desc;
+  }
+  return std::string();
+}
+
+struct Search {
+  ElfW(Addr) base;
+  std::string version;
+};
+
+int VisitObject(struct dl_phdr_info* info, std::size_t, void* data) {
+  Search& search = *static_cast<Search*>(data);
+  if (info->dlpi_addr != search.base) return 0;
+  for (ElfW(Half) i = 0; i < info->dlpi_phnum; ++i) {
+    const ElfW(Phdr)& segment = info->dlpi_phdr[i];
+    if (segment.p_type != PT_NOTE) continue;
+    search.version = FindVersion(reinterpret_cast<const char*>(info->dlpi_addr + segment.p_vaddr),
+                                 segment.p_memsz);
+    if (!search.version.empty()) return 1;
+  }
+  return 1;
+}
+
+}  // namespace
+
+std::string LoadedVersion(void* handle) {
+  struct link_map* map = nullptr;
+  if (dlinfo(handle, RTLD_DI_LINKMAP, &map) != 0 || map == nullptr) return std::string();
+  Search search{map->l_addr, std::string()};
+  dl_iterate_phdr(&VisitObject, &search);
+  return search.version;
 }
 
 const char* PluginSubdirectory() { return HYRACLI_PLUGIN_SUBDIR; }

@@ -22,6 +22,13 @@ class PluginError : public std::runtime_error {
   ~PluginError() override;
 };
 
+// A loaded plug-in: its file name and the version it was built with (empty
+// when the library carries none).
+struct PluginVersion {
+  std::string name;
+  std::string version;
+};
+
 // Owns the loaded libraries. The tree that plug-ins filled holds objects whose
 // code lives in them, so it must be dropped before the loader.
 class PluginLoader {
@@ -40,12 +47,21 @@ class PluginLoader {
   // Loads one library and calls its entry with root.
   void Load(const std::string& path, boost::shared_ptr<Fendle::AutoCli::Namespace>& root);
 
+  // The plug-ins registered so far, in loading order.
+  const std::vector<PluginVersion>& Versions() const;
+
  private:
   struct Closer {
     void operator()(void* handle) const;
   };
   std::vector<std::unique_ptr<void, Closer> > handles_;
+  std::vector<PluginVersion> versions_;
 };
+
+// The version a plug-in library carries in its ELF note "Hyracli" of type 1
+// (a NUL-terminated text), read from the loaded image of handle; empty when
+// it has none.
+std::string LoadedVersion(void* handle);
 
 // The plug-in directory: given when not empty, else $HYRACLI_PLUGIN_DIR when
 // set and not empty, else ../lib/hyracli/plugins from the running executable's

@@ -4,7 +4,8 @@
 set -euo pipefail
 packages=(build-essential cmake libboost-dev libsqlite3-dev nlohmann-json3-dev libgtest-dev libgmock-dev
   dpkg-dev bash-completion mandoc zsh fish
-  libbenchmark-dev hyperfine sqlite3 time)
+  libbenchmark-dev hyperfine sqlite3 time
+  python3 libxml2-utils)
 missing=()
 for p in "${packages[@]}"; do
   dpkg-query -W -f='${Status}' "$p" 2>/dev/null | grep -q "install ok installed" || missing+=("$p")

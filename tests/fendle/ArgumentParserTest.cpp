@@ -62,7 +62,19 @@ TEST(ArgumentParserTest, RefusesWhatTheCommandCouldNotRunWith) {
       {{"-n", "x", "-z"}, "Unknown option '-z'"},
       {{"-n", "x", "-nf"}, "Unknown option '-nf'"},
       {{"-n", "x", "stray"}, "Unexpected argument 'stray'"},
-      {{"-n", "x", "--"}, "Unexpected argument '--'"},
+      // "--" ends the options; the command takes no other word.
+      {{"-n", "x", "--", "-t", "1"}, "Unexpected argument '-t'"},
+      {{"-n", "x", "--", "--help"}, "Unexpected argument '--help'"},
+      // A mistyped long option gets the closest names, a far one none.
+      {{"-n", "x", "--cuont", "1"}, "Unknown option '--cuont'\nDid you mean '--count'?"},
+      {{"-n", "x", "--fource"}, "Unknown option '--fource'\nDid you mean '--force'?"},
+      {{"-n", "x", "--zzzzzz"}, "Unknown option '--zzzzzz'"},
+      // An echoed value is cut and its control bytes are shown escaped.
+      {{"-n", "x", "-t", std::string(300, 'x') + "\x1B"},
+       "Value '" + std::string(256, 'x') +
+           "... (cut, 301 bytes in all)' of option --count is "
+           "not an integer"},
+      {{"-n", "x", "-t", "1\x1B[2J"}, "Value '1\\x1B[2J' of option --count is not an integer"},
       {{"--name"}, "Option --name needs a value"},
       {{"-n", "x", "-t"}, "Option --count needs a value"},
       {{"-n", "x", "-t", "abc"}, "Value 'abc' of option --count is not an integer"},

@@ -55,7 +55,8 @@ TEST(FormatterTest, ScalarsAndPlainListsPrintAsLinesInSimpleAndTable) {
   for (const char* formatter : {"simple", "table"}) {
     for (const auto& c : cases) EXPECT_EQ(Render(formatter, c.first), c.second) << formatter;
   }
-  EXPECT_FALSE(Fendle::Format::CreateFormatter("xml"));
+  EXPECT_FALSE(Fendle::Format::CreateFormatter("yaml"));
+  EXPECT_TRUE(Fendle::Format::CreateFormatter("KeyValue"));
 }
 
 TEST(SimpleFormatterTest, RecordsAreHeadedByTheHintAndNestedValuesIndent) {
@@ -139,6 +140,17 @@ TEST(JsonFormatterTest, StructsFollowTheDisplayOrderAndTextsStayExact) {
   EXPECT_EQ(
       Render("json", odd),
       "{\n  \"Na\xEF\xBF\xBDme\": \"ab\xEF\xBF\xBD\xEF\xBF\xBD\\n\",\n  \"Ok\": \"\xC3\xA4\"\n}\n");
+}
+
+TEST(FormatterTest, ControlBytesFromTheHostReachTheTerminalEscaped) {
+  auto row = MetaStruct::New("R");
+  row->SetField("Name", "a\x1B[2Jb\tc\rd\xC2\x9B\xFF\xC3\xA4\x7F");
+  EXPECT_EQ(Render("simple", row), "R\n  Name: a\\x1B[2Jb\tc\\x0Dd\\xC2\\x9B\\xFF\xC3\xA4\\x7F\n");
+  // In a table a tab would break the columns.
+  EXPECT_EQ(Render("table", row), "Name\n" + std::string(36, '-') +
+                                      "\n"
+                                      "a\\x1B[2Jb\\x09c\\x0Dd\\xC2\\x9B\\xFF\xC3\xA4\\x7F\n");
+  EXPECT_EQ(Render("simple", MetaString::New("ok\x07\n")), "ok\\x07\n");
 }
 
 }  // namespace

@@ -73,7 +73,9 @@ TEST_F(EndToEndTest, PluginFailuresExitWithStatusThreeAndSayWhy) {
   EXPECT_EQ(Run({"--plugin-dir", FAILING_PLUGIN_DIR, "storage"}),
             prefix + "Cannot register plug-in " FAILING_PLUGIN_DIR
                      "/failing.plugin.so: Unable to initialize tarnLib "
-                     "(internal/StorageContainerLoad:42)\n");
+                     "(internal/StorageContainerLoad:42)\n"
+                     "hyracli: hint: if the simulated Tarnd is stopped, start it with "
+                     "'hyrasim daemon start'\n");
   // What the failing entry registered was dropped while its code was loaded.
   EXPECT_EQ(Read(dir_ / "trace"), "Leftover destroyed\n");
   EXPECT_EQ(Run({"--plugin-dir", NOENTRY_PLUGIN_DIR}),
@@ -83,7 +85,20 @@ TEST_F(EndToEndTest, PluginFailuresExitWithStatusThreeAndSayWhy) {
       prefix + "Cannot load plug-in " + (dir_ / "junk/broken.plugin.so").string();
   EXPECT_EQ(Run({"--plugin-dir", dir_ / "junk"}).substr(0, junk.size()), junk);
   // Global options are checked before any plug-in is loaded.
-  EXPECT_EQ(Run({"--formatter", "xml", "--plugin-dir", FAILING_PLUGIN_DIR}).substr(0, 4), "2||h");
+  EXPECT_EQ(Run({"--formatter", "yaml", "--plugin-dir", FAILING_PLUGIN_DIR}).substr(0, 4), "2||h");
+}
+
+TEST_F(EndToEndTest, VersionsAndAnEmptyPluginDirectoryAreReported) {
+  // Plug-ins built without a version note are still listed.
+  EXPECT_EQ(Run({"--version", "--plugin-dir", GOOD_PLUGIN_DIR}),
+            std::string("0|hyracli ") + HYRA_VERSION +
+                "\n10-first.plugin.so (no version)\n20-second.plugin.so (no version)\n|");
+  fs::create_directories(dir_ / "empty");
+  EXPECT_EQ(Run({"--plugin-dir", dir_ / "empty", "storage", "internal"}),
+            "2||hyracli: Unknown namespace or command 'internal' in 'hyracli storage'\n"
+            "Run 'hyracli storage --help' for help.\n"
+            "hyracli: no plug-in was loaded from " +
+                (dir_ / "empty").string() + " (plug-ins are its *.plugin.so files)\n");
 }
 
 }  // namespace

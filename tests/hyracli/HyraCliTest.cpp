@@ -29,6 +29,10 @@ void Act(const In& in, const Out& out) {
     out->SetError("reported first");
     throw HostCtl::Lib::HostCtlException("then thrown", HostCtl::Lib::KelmMessage());
   }
+  if (what.compare(0, 4, "err:") == 0) {
+    out->SetError(what.substr(4));
+    return;
+  }
   if (what == "fail") {
     out->SetError("first");
     out->SetError("second\n");
@@ -124,10 +128,9 @@ TEST_F(HyraCliTest, StatusAndStreamsOfEveryOutcome) {
        "2||hyracli: 'hyracli storage' is a namespace and takes no option '--x'\n"
        "Run 'hyracli storage --help' for help.\n"},
       {{"storage", "test", "act"}, "2||hyracli: Missing required option: --do" + actUsage},
-      {{"storage", "test", "act", "-d", "x", "--formatter", "json"},
-       "2||hyracli: Unknown option '--formatter'" + actUsage},
-      {{"--formatter", "xml", "storage", "test", "act", "-d", "x"},
-       "2||hyracli: Unknown formatter 'xml'; choose simple, table or json" + usage},
+      {{"--formatter", "yaml", "storage", "test", "act", "-d", "x"},
+       "2||hyracli: Unknown formatter 'yaml'; choose simple, table, json, xml, csv or keyvalue" +
+           usage},
       {{"--formatter"}, "2||hyracli: Option --formatter needs a value" + usage},
       {{"--formatter", "json", "--formatter", "table"},
        "2||hyracli: Option --formatter is given more than once" + usage},
@@ -136,6 +139,68 @@ TEST_F(HyraCliTest, StatusAndStreamsOfEveryOutcome) {
   for (const auto& c : cases) EXPECT_EQ(RunTool(root_, c.first), c.second);
   // Once per run of "act" above: help and usage errors never ran it.
   EXPECT_EQ(act_->runs_, 11);
+}
+
+TEST_F(HyraCliTest, GlobalOptionsHelpWordsAndTheTerminatorWhereverUsersPutThem) {
+  const std::string actUsage = "\nRun 'hyracli storage test act --help' for help.\n";
+  const std::pair<Words, std::string> cases[] = {
+      // The formatter after the command's options, by either name, in any case.
+      {{"storage", "test", "act", "-d", "x", "--formatter", "json"}, "0|\"x\"\n|"},
+      {{"storage", "test", "act", "-d", "x", "-o", "JSON"}, "0|\"x\"\n|"},
+      {{"storage", "test", "act", "--formatter=CSV", "-d", "x"}, "0|value\r\nx\r\n|"},
+      {{"-o", "KeyValue", "storage", "test", "act", "-d", "x"}, "0|value=x\n|"},
+      // ... but not where it is an option's value or after "--".
+      {{"storage", "test", "act", "-d", "--formatter"}, "0|--formatter\n|"},
+      {{"storage", "test", "act", "-d", "x", "--", "--formatter", "json"},
+       "2||hyracli: Unexpected argument '--formatter'" + actUsage},
+      {{"-o", "json", "storage", "test", "act", "-d", "x", "--formatter", "table"},
+       "2||hyracli: Option --formatter is given more than once" + actUsage},
+      {{"storage", "test", "act", "-d", "x", "--formatter", "jsno"},
+       "2||hyracli: Unknown formatter 'jsno'; choose simple, table, json, xml, csv or keyvalue\n"
+       "Did you mean 'json'?" +
+           actUsage},
+      // Help by -h and by the word help, before the words or after a namespace.
+      {{"storage", "test", "act", "-h"}, std::string("0|") + kActHelp + "|"},
+      {{"help", "storage", "test", "act"}, std::string("0|") + kActHelp + "|"},
+      {{"storage", "-h", "test"}, std::string("0|") + kTestList + "|"},
+      {{"storage", "test", "help"}, std::string("0|") + kTestList + "|"},
+      // "--" ends the global options, then the command's.
+      {{"--", "storage", "test", "act", "-d", "x", "--"}, "0|x\n|"},
+      // Suggestions for a near miss; none for nonsense.
+      {{"storage", "tset"},
+       "2||hyracli: Unknown namespace or command 'tset' in 'hyracli storage'\n"
+       "Did you mean 'test'?\nRun 'hyracli storage --help' for help.\n"},
+      {{"storage", "test", "ACT"},
+       "2||hyracli: Unknown namespace or command 'ACT' in 'hyracli storage test'\n"
+       "Did you mean 'act'?\nRun 'hyracli storage test --help' for help.\n"},
+      {{"storage", "qqqqqq"},
+       "2||hyracli: Unknown namespace or command 'qqqqqq' in 'hyracli storage'\n"
+       "Run 'hyracli storage --help' for help.\n"},
+      {{"--formater", "json"},
+       "2||hyracli: Unknown global option '--formater'\nDid you mean '--formatter'?\n"
+       "Run 'hyracli --help' for help.\n"},
+      {{"--version"}, std::string("0|hyracli ") + HYRA_VERSION + "\n|"},
+  };
+  for (const auto& c : cases) {
+    EXPECT_EQ(RunTool(root_, c.first), c.second) << testing::PrintToString(c.first);
+  }
+}
+
+TEST_F(HyraCliTest, TextsForTheTerminalAreEscapedAndHugeErrorsCut) {
+  // A result and an error that carry terminal escape sequences.
+  EXPECT_EQ(RunTool(root_, {"storage", "test", "act", "-d",
+                            "a\x1B]0;owned\x07"
+                            "b"}),
+            "0|a\\x1B]0;owned\\x07b\n|");
+  EXPECT_EQ(RunTool(root_, {"storage", "test", "act", "-d", "err:bad \x1B[2J\r"}),
+            "1||bad \\x1B[2J\\x0D\n");
+  EXPECT_EQ(RunTool(root_, {"storage", "\x1B[31m"}).substr(0, 57),
+            "2||hyracli: Unknown namespace or command '\\x1B[31m' in 'h");
+  // A 100 KiB value echoed by an error is cut, at a character boundary.
+  const std::string huge = std::string(4095, 'v') + "\xC3\xA4" + std::string(100 * 1024, 'v');
+  const std::string cut = RunTool(root_, {"storage", "test", "act", "-d", "err:" + huge});
+  EXPECT_EQ(cut, "1||" + std::string(4095, 'v') + "... (cut, " + std::to_string(huge.size()) +
+                     " bytes in all)\n");
 }
 
 }  // namespace
