@@ -22,8 +22,17 @@ constexpr int64_t kInt64Max = std::numeric_limits<int64_t>::max();
 
 const char* const kProviderStatuses[] = {"online", "offline", "syncError", "unknown", "default"};
 
+// Keys and texts of the document reach refusals; a long one is cut, so that
+// a refusal stays a line, not a copy of the input.
+constexpr size_t kMaxShown = 160;
+
+std::string Cut(const std::string& text) {
+  return text.size() <= kMaxShown ? text : text.substr(0, kMaxShown) + "...";
+}
+
 [[noreturn]] void Refuse(const std::string& path, const std::string& what) {
-  throw WorldError("scenario: " + (path.empty() ? std::string("document") : path) + ": " + what);
+  throw WorldError("scenario: " + (path.empty() ? std::string("document") : Cut(path)) + ": " +
+                   Cut(what));
 }
 
 std::string Join(const std::string& path, const std::string& key) {
@@ -60,10 +69,6 @@ int64_t AsInteger(const Json& value, const std::string& path, int64_t min, int64
   return number;
 }
 
-// The longest text of a parser's own message that is repeated: its messages
-// quote the token they stopped at, which may be the whole file.
-constexpr size_t kMaxParserText = 200;
-
 // Deeper than any scenario record goes; a document nested further is refused
 // before it costs more than this much.
 constexpr size_t kMaxDepth = 64;
@@ -99,9 +104,9 @@ class DocumentBuilder : public nlohmann::json_sax<Json> {
     // 406: a number beyond what a double holds, such as 1e400 or a
     // 100,000-digit integer.
     if (error.id == 406) Refuse(Here(), "is a number too large for any field");
-    std::string text = error.what();
-    if (text.size() > kMaxParserText) text = text.substr(0, kMaxParserText) + "...";
-    throw WorldError("scenario: not valid JSON: " + text);
+    // The parser's message quotes the token it stopped at, which may be the
+    // whole file.
+    throw WorldError("scenario: not valid JSON: " + Cut(error.what()));
   }
 
  private:

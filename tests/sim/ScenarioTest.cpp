@@ -72,6 +72,9 @@ TEST_F(Scenario, BadScenariosNameTheFieldAndChangeNothing) {
       // A parser message quotes its token, here all of it; only its start is kept.
       {"{\"arrays\": \"" + std::string(100000, 'x'), "scenario: not valid JSON"},
       {std::string(100000, '['), "scenario: [0][0][0][0][0][0][0][0][0][0][0][0][0][0][0][0][0]"},
+      {R"({"daemon": {")" + std::string(100000, 'k') + R"(": 1}})", "scenario: daemon.kkkkkkkk"},
+      {R"({"host": {"mounted": [{"name": "m", "id": ")" + std::string(100000, 'i') + "\"}]}}",
+       "scenario: host.mounted[0].id: \"iiiiiiii"},
       // Numbers past what a double holds, or past 64 bits, name their field.
       {R"({"daemon": {"logLevel": 1e400}})", "scenario: daemon.logLevel: is a number too large"},
       {R"({"arrays": [{"id": "a"}, {"id": "b", "name": -)" + std::string(100000, '7') + "}]}",
