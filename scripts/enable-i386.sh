@@ -14,7 +14,9 @@ gcc -m32 "$probe_dir/probe.c" -o "$probe_dir/probe"
 binfmt=/proc/sys/fs/binfmt_misc
 if [[ ! -e $binfmt/qemu-i386 ]]; then
   if ! dpkg-query -W -f='${Status}' qemu-user-static 2>/dev/null | grep -q "install ok installed"; then
-    DEBIAN_FRONTEND=noninteractive apt-get install -y -qq --no-install-recommends qemu-user-static
+    export DEBIAN_FRONTEND=noninteractive
+    apt-get update -qq
+    apt-get install -y -qq --no-install-recommends qemu-user-static
   fi
   [[ -e $binfmt/register ]] || mount -t binfmt_misc binfmt_misc "$binfmt"
   # ELF, 32-bit, little-endian, executable or position-independent, i386; F
