@@ -1,13 +1,12 @@
 // hyrasim: sets up, shows and steers the simulated Hyra host that the stand-in
 // host libraries run on.
 #include <charconv>
-#include <fstream>
 #include <iostream>
-#include <sstream>
 #include <string>
 #include <vector>
 
 #include "Scenario.h"
+#include "ScenarioFile.h"
 #include "World.h"
 #include "WorldText.h"
 
@@ -59,15 +58,6 @@ int64_t ParseCount(const std::string& option, const std::string& text) {
   return value;
 }
 
-std::string ReadFile(const std::string& path) {
-  std::ifstream file(path, std::ios::binary);
-  if (!file) throw HyraSim::WorldError("cannot read the scenario file " + path);
-  std::ostringstream text;
-  text << file.rdbuf();
-  if (file.bad()) throw HyraSim::WorldError("cannot read the scenario file " + path);
-  return text.str();
-}
-
 int Init(const Args& args) {
   if (args.size() == 1 && args[0] == "--demo") {
     HyraSim::InitDemo();
@@ -75,7 +65,7 @@ int Init(const Args& args) {
     return 0;
   }
   Expect(args.size() == 2 && args[0] == "--scenario", "init takes --demo or --scenario FILE");
-  HyraSim::InitScenario(ReadFile(args[1]));
+  HyraSim::InitScenario(HyraSimTool::ReadScenarioFile(args[1]));
   std::cout << "The world at " << HyraSim::DatabasePath() << " now holds " << args[1] << ".\n";
   return 0;
 }

@@ -1,5 +1,6 @@
 #include <algorithm>
 #include <cctype>
+#include <cmath>
 #include <cstdint>
 #include <iterator>
 #include <limits>
@@ -23,8 +24,17 @@ constexpr int64_t kInt64Max = std::numeric_limits<int64_t>::max();
 
 const char* const kProviderStatuses[] = {"online", "offline", "syncError", "unknown", "default"};
 
+// Keys and texts of the document reach refusals; a long one is cut, so that
+// a refusal stays a line, not a copy of the input.
+constexpr size_t kMaxShown = 160;
+
+std::string Cut(const std::string& text) {
+  return text.size() <= kMaxShown ? text : text.substr(0, kMaxShown) + "...";
+}
+
 [[noreturn]] void Refuse(const std::string& path, const std::string& what) {
-  throw WorldError("scenario: " + (path.empty() ? std::string("document") : path) + ": " + what);
+  throw WorldError("scenario: " + (path.empty() ? std::string("document") : Cut(path)) + ": " +
+                   Cut(what));
 }
 
 std::string Join(const std::string& path, const std::string& key) {
@@ -43,16 +53,113 @@ std::string AsText(const Json& value, const std::string& path) {
   return text;
 }
 
+[[noreturn]] void RefuseRange(const std::string& path, int64_t min, int64_t max) {
+  Refuse(path, "must be between " + std::to_string(min) + " and " + std::to_string(max));
+}
+
 int64_t AsInteger(const Json& value, const std::string& path, int64_t min, int64_t max) {
+  // A whole number past 64 bits reaches us as a floating-point one; it is out
+  // of range rather than not whole.
+  if (value.is_number_float() && std::abs(value.get<double>()) >= 0x1p63) {
+    RefuseRange(path, min, max);
+  }
   if (!value.is_number_integer()) Refuse(path, "must be a whole number");
   const bool tooLarge =
       value.is_number_unsigned() && value.get<uint64_t>() > static_cast<uint64_t>(kInt64Max);
   const int64_t number = tooLarge ? kInt64Max : value.get<int64_t>();
-  if (tooLarge || number < min || number > max) {
-    Refuse(path, "must be between " + std::to_string(min) + " and " + std::to_string(max));
-  }
+  if (tooLarge || number < min || number > max) RefuseRange(path, min, max);
   return number;
 }
+
+// Deeper than any scenario record goes; a document nested further is refused
+// before it costs more than this much.
+constexpr size_t kMaxDepth = 64;
+
+// Builds the document while keeping the path to the value being read, so that
+// what the parser refuses names its field too, and refuses a key given twice
+// in one object (a plain parse keeps the last and loses the others silently).
+class DocumentBuilder : public nlohmann::json_sax<Json> {
+ public:
+  Json TakeDocument() { return std::move(document_); }
+
+  bool null() override { return Put(nullptr); }
+  bool boolean(bool value) override { return Put(value); }
+  bool number_integer(number_integer_t value) override { return Put(value); }
+  bool number_unsigned(number_unsigned_t value) override { return Put(value); }
+  bool number_float(number_float_t value, const string_t&) override { return Put(value); }
+  bool string(string_t& value) override { return Put(std::move(value)); }
+  bool binary(binary_t&) override { Refuse(Here(), "must not be binary data"); }
+  bool start_object(std::size_t) override { return Open(Json::object()); }
+  bool start_array(std::size_t) override { return Open(Json::array()); }
+  bool end_object() override { return Close(); }
+  bool end_array() override { return Close(); }
+
+  bool key(string_t& key) override {
+    Frame& frame = open_.back();
+    if (!frame.keys.insert(key).second) Refuse(Join(frame.path, key), "is given more than once");
+    frame.key = std::move(key);
+    return true;
+  }
+
+  bool parse_error(std::size_t, const std::string&,
+                   const nlohmann::detail::exception& error) override {
+    // 406: a number beyond what a double holds, such as 1e400 or a
+    // 100,000-digit integer.
+    if (error.id == 406) Refuse(Here(), "is a number too large for any field");
+    // The parser's message quotes the token it stopped at, which may be the
+    // whole file.
+    throw WorldError("scenario: not valid JSON: " + Cut(error.what()));
+  }
+
+ private:
+  // An object or list being read; value points into its parent, which gains
+  // no element while this one is open, so the pointer stays valid.
+  struct Frame {
+    Json* value;
+    std::string path;
+    std::string key;            // of the value being read, in an object
+    std::set<std::string> keys;  // given so far, in an object
+  };
+
+  // Where the next value goes.
+  std::string Here() const {
+    if (open_.empty()) return "";
+    const Frame& frame = open_.back();
+    return frame.value->is_object() ? Join(frame.path, frame.key)
+                                    : Index(frame.path, frame.value->size());
+  }
+
+  Json* Place(Json value) {
+    if (open_.empty()) {
+      document_ = std::move(value);
+      return &document_;
+    }
+    Json& parent = *open_.back().value;
+    if (parent.is_object()) return &(parent[open_.back().key] = std::move(value));
+    parent.push_back(std::move(value));
+    return &parent.back();
+  }
+
+  bool Put(Json value) {
+    Place(std::move(value));
+    return true;
+  }
+
+  bool Open(Json empty) {
+    std::string path = Here();
+    if (open_.size() >= kMaxDepth) Refuse(path, "is nested too deeply");
+    open_.push_back({Place(std::move(empty)), std::move(path), {}, {}});
+    return true;
+  }
+
+  bool Close() {
+    open_.pop_back();
+    return true;
+  }
+
+  Json document_;
+  std::vector<Frame> open_;
+};
 
 // One JSON object being read. Every field it has must be read, so that a
 // misspelt field is reported instead of being silently ignored.
@@ -353,6 +460,8 @@ void ReadHost(Record& host, WorldState& world) {
   ForEach(host, "providers", [&](Record& r) {
     Provider provider;
     provider.name = r.Text("name");
+    // The host finds a provider by its name; an empty one names none.
+    if (provider.name.empty()) Refuse(r.PathOf("name"), "must not be empty");
     providerNames.Add(provider.name, r.PathOf("name"));
     provider.url = r.Text("url", "");
     provider.reserved = r.Text("reserved", "");
@@ -366,6 +475,7 @@ void ReadHost(Record& host, WorldState& world) {
     world.providers.push_back(std::move(provider));
   });
   UniqueKeys mountNames("mounted name");
+  UniqueKeys mountIds("mounted container id");
   ForEach(host, "mounted", [&](Record& r) {
     Mount mount;
     mount.name = r.Text("name");
@@ -374,6 +484,11 @@ void ReadHost(Record& host, WorldState& world) {
     }
     mountNames.Add(mount.name, r.PathOf("name"));
     mount.id = r.Text("id");
+    // The host unmounts by the normal form of the id, so a mount whose id has
+    // none could never go, and two mounts of one container would go together.
+    const auto normalId = NormalContainerId(mount.id);
+    if (!normalId) Refuse(r.PathOf("id"), "\"" + mount.id + "\" is not a valid container id");
+    mountIds.Add(*normalId, r.PathOf("id"), mount.id);
     mount.arrays = r.Texts("arrays");
     world.mounted.push_back(std::move(mount));
   });
@@ -383,12 +498,9 @@ void ReadHost(Record& host, WorldState& world) {
 }  // namespace
 
 WorldState ReadScenario(const std::string& json) {
-  Json document;
-  try {
-    document = Json::parse(json);
-  } catch (const Json::parse_error& e) {
-    throw WorldError(std::string("scenario: not valid JSON: ") + e.what());
-  }
+  DocumentBuilder builder;
+  Json::sax_parse(json, &builder);
+  const Json document = builder.TakeDocument();
   WorldState world;
   Record top(document, "");
   if (const Json* value = top.Find("daemon")) {

@@ -101,9 +101,8 @@ TEST_F(ConfigTarnTest, MountUmountAndRemoveReportTheirOwnTexts) {
 
 TEST_F(ConfigTarnTest, TheFirstMatchingContainerIsNamedByUuidBeforeName) {
   json world = World();
-  world["host"]["mounted"].push_back({{"name", "gold2"},
-                                      {"id", "6F1C2F4E-8D3B-4C1A-9E2F-0A1B2C3D4E5F"},
-                                      {"arrays", json::array()}});
+  world["host"]["mounted"].push_back(
+      {{"name", "silver"}, {"id", kSilver}, {"arrays", json::array()}});
   LoadScenario(world);
   Arm("MatchesContainerId", "asked twice", 1);  // the walk ends at the first match
   EXPECT_EQ(RunCommand(*ConfigTarnMountdir::New(),

@@ -56,7 +56,9 @@ class StorageContainerTest : public SimWorldTest {
            {"vpUrl", "https://vp2.example.test:8443/kiro"}});
     }
     for (int i : mounted) {
-      world["host"]["mounted"].push_back({{"name", "c" + std::to_string(i)}, {"id", "x"}});
+      world["host"]["mounted"].push_back(
+          {{"name", "c" + std::to_string(i)},
+           {"id", "00000000-0000-4000-8000-00000000000" + std::to_string(i)}});
     }
     return world;
   }

@@ -2,6 +2,7 @@
 // refusals that name the field, and the database file itself.
 #include <sqlite3.h>
 #include <sys/stat.h>
+#include <unistd.h>
 
 #include <string>
 
@@ -39,7 +40,7 @@ const char kFullScenario[] = R"json({
   "host": {
     "providers": [ { "name": "vp1", "url": "https://vp1.example.test:8443/kiro", "reserved": "kept",
                      "arrays": [ { "arrayId": "array-a", "isActive": true, "priority": -1 } ] } ],
-    "mounted": [ { "name": "gold", "id": "not even an id", "arrays": ["array-a"] } ],
+    "mounted": [ { "name": "gold", "id": "6F1C2F4E8D3B4C1A9E2F0A1B2C3D4E5F", "arrays": ["array-a"] } ],
     "kiroContext": "zm-1" }
 })json";
 
@@ -61,12 +62,35 @@ TEST_F(Scenario, InitThenShowGivesTheSameDocument) {
 
 TEST_F(Scenario, BadScenariosNameTheFieldAndChangeNothing) {
   struct Case {
-    const char* json;
+    std::string json;
     const char* error;
   };
+  const std::string mount = R"({"name": "m", "id": "6f1c2f4e-8d3b-4c1a-9e2f-0a1b2c3d4e5f"})";
   const Case cases[] = {
       {"[]", "scenario: document: must be an object"},
       {"{\"arrays\": [", "scenario: not valid JSON"},
+      // A parser message quotes its token, here all of it; only its start is kept.
+      {"{\"arrays\": \"" + std::string(100000, 'x'), "scenario: not valid JSON"},
+      {std::string(100000, '['), "scenario: [0][0][0][0][0][0][0][0][0][0][0][0][0][0][0][0][0]"},
+      {R"({"daemon": {")" + std::string(100000, 'k') + R"(": 1}})", "scenario: daemon.kkkkkkkk"},
+      {R"({"host": {"mounted": [{"name": "m", "id": ")" + std::string(100000, 'i') + "\"}]}}",
+       "scenario: host.mounted[0].id: \"iiiiiiii"},
+      // Numbers past what a double holds, or past 64 bits, name their field.
+      {R"({"daemon": {"logLevel": 1e400}})", "scenario: daemon.logLevel: is a number too large"},
+      {R"({"arrays": [{"id": "a"}, {"id": "b", "name": -)" + std::string(100000, '7') + "}]}",
+       "scenario: arrays[1].name: is a number too large"},
+      {R"({"daemon": {"dumpRequests": 18446744073709551616}})",
+       "scenario: daemon.dumpRequests: must be between 0 and 9223372036854775807"},
+      {R"({"daemon": {"logLevel": 1, "running": true, "logLevel": 2}})",
+       "scenario: daemon.logLevel: is given more than once"},
+      {R"({"host": {"mounted": [{"name": "m", "id": "m"}]}})",
+       "scenario: host.mounted[0].id: \"m\" is not a valid container id"},
+      {R"({"host": {"mounted": [)" + mount +
+           R"(, {"name": "n", "id": "6F1C2F4E8D3B4C1A9E2F0A1B2C3D4E5F"}]}})",
+       "scenario: host.mounted[1].id: duplicate mounted container id "
+       "\"6F1C2F4E8D3B4C1A9E2F0A1B2C3D4E5F\""},
+      {R"({"host": {"providers": [{"name": ""}]}})",
+       "scenario: host.providers[0].name: must not be empty"},
       {R"({"colour": 1})", "scenario: colour: is not a field of this record"},
       {R"({"daemon": {"logLevel": "high"}})", "scenario: daemon.logLevel: must be a whole number"},
       {R"({"daemon": {"unbindPeriod": 2147483648}})", "daemon.unbindPeriod: must be between"},
@@ -114,10 +138,40 @@ TEST_F(Scenario, BadScenariosNameTheFieldAndChangeNothing) {
   for (const Case& c : cases) {
     WriteFile("bad.json", c.json);
     const SimTest::ToolResult result = Hyrasim("init --scenario " + Path("bad.json"));
-    EXPECT_NE(result.status, 0) << c.json;
-    EXPECT_NE(result.err.find(c.error), std::string::npos) << result.err;
+    EXPECT_NE(result.status, 0) << c.json.substr(0, 80);
+    EXPECT_NE(result.err.find(c.error), std::string::npos) << result.err.substr(0, 400);
+    EXPECT_LT(result.err.size(), 400u) << "a refusal repeats no long input";
   }
   EXPECT_EQ(HyraSim::ExportScenario(), before);
+}
+
+// Only a regular file of at most 64 MiB is read, and nothing else is even
+// opened: a pipe with no writer would hold the reader forever.
+TEST_F(Scenario, ScenarioFileMustBeARegularFileOfAtMost64MiB) {
+  ASSERT_EQ(mkfifo(Path("pipe").c_str(), 0600), 0);
+  WriteFile("huge.json", "");
+  ASSERT_EQ(truncate(Path("huge.json").c_str(), (64 << 20) + 1), 0);  // sparse, so cheap
+  const std::string refused = "hyrasim: cannot read the scenario file ";
+  const struct {
+    std::string path;
+    std::string why;
+  } cases[] = {
+      {Path("pipe"), "it is a named pipe, not a regular file"},
+      {dir_.string(), "it is a directory, not a regular file"},
+      {"/dev/zero", "it is a device, not a regular file"},
+      {Path("huge.json"), "it is larger than 64 MiB"},
+      {Path("missing.json"), "No such file or directory"},
+  };
+  const std::string before = HyraSim::ExportScenario();
+  for (const auto& c : cases) {
+    EXPECT_EQ(Hyrasim("init --scenario " + c.path).err, refused + c.path + ": " + c.why + "\n");
+  }
+  EXPECT_EQ(HyraSim::ExportScenario(), before);
+
+  // A file of exactly the largest size is read (and here refused as JSON).
+  ASSERT_EQ(truncate(Path("huge.json").c_str(), 64 << 20), 0);
+  EXPECT_NE(Hyrasim("init --scenario " + Path("huge.json")).err.find("not valid JSON"),
+            std::string::npos);
 }
 
 TEST_F(Scenario, TextsThatAreNotUtf8AreStoredAndShownReplaced) {
