@@ -114,7 +114,7 @@ if command -v zsh >/dev/null; then
   }
   zsh_expect "storage completion" hyracli sto
   zsh_expect "add set remove activate deactivate injectfault" "${tarn[@]}" kiroprovider ""
-  zsh_expect "--vp-name -v --vp-url -U --arrayid -a --priority -p --isactive -i --help" \
+  zsh_expect "--vp-name -v --vp-url -U --arrayid -a --priority -p --isactive -i --help -h" \
     "${add[@]}" -v vp3 -
   zsh_expect "true false" "${add[@]}" --isactive ""
   zsh_expect "true false" "${add[@]}" --isactive=
