@@ -1,22 +1,9 @@
-// Measures what a large result costs: builds the result of a load of N
-// containers (two arrays of four endpoints each, as the plug-in builds it),
-// reports the heap its values take, then renders it to standard output with
-// the formatter named. Run under /usr/bin/time -v to see the peak beside the
-// output's size:
-//
-//   render_memory_probe FORMATTER [ROWS] [--buffered] > out
-//
-// --buffered renders into a string first and writes that, as the tool once
-// did, for comparison.
-#include <malloc.h>
+#include "LoadResult.h"
 
-#include <cstring>
-#include <iostream>
-#include <sstream>
 #include <string>
+#include <vector>
 
-#include "fendle/Formatter.h"
-
+namespace Bench {
 namespace {
 
 using namespace Fendle::MetaObj;
@@ -39,6 +26,8 @@ boost::shared_ptr<MetaStruct> RowPrototype() {
   row->SetField("Arrays", MetaList::New(MetaType::Struct, ArrayPrototype()));
   return row;
 }
+
+}  // namespace
 
 boost::shared_ptr<MetaList> LoadResult(int rows) {
   auto list = MetaList::New(MetaType::Struct, RowPrototype());
@@ -72,35 +61,13 @@ boost::shared_ptr<MetaList> LoadResult(int rows) {
   return list;
 }
 
-}  // namespace
-
-int main(int argc, char** argv) {
-  if (argc < 2) {
-    std::cerr << "usage: render_memory_probe FORMATTER [ROWS] [--buffered]\n";
-    return 2;
-  }
-  const int rows = argc > 2 && argv[2][0] != '-' ? std::stoi(argv[2]) : 10000;
-  const bool buffered = std::strcmp(argv[argc - 1], "--buffered") == 0;
-  const std::size_t before = mallinfo2().uordblks;
-  const boost::shared_ptr<MetaList> result = LoadResult(rows);
-  const std::size_t tree = mallinfo2().uordblks - before;
-  const Fendle::Format::FormatHints hints(
+Fendle::Format::FormatHints LoadHints(const boost::shared_ptr<MetaList>& result) {
+  return Fendle::Format::FormatHints(
       {{"header:StorageContainer", "%StorageContainer Name%"},
        {"header:Array", "%ArrayId%"},
        {"table-columns",
         "StorageContainer Name,StorageContainer Id,Max Tarn Size (MB),VP URL,Arrays"}},
       result);
-  auto formatter = Fendle::Format::CreateFormatter(argv[1]);
-  if (!formatter) return 2;
-  if (buffered) {
-    std::ostringstream text;
-    formatter->Render(result, hints, text);
-    std::cout << text.str();
-  } else {
-    formatter->Render(result, hints, std::cout);
-  }
-  std::cout.flush();
-  std::cerr << rows << " rows: values take " << tree << " bytes of heap (" << tree / rows
-            << " per row)\n";
-  return std::cout ? 0 : 1;
 }
+
+}  // namespace Bench
