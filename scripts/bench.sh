@@ -13,7 +13,7 @@ rounds=${1:-5}
 build=build-bench
 cmake -S . -B "$build" -DCMAKE_BUILD_TYPE=RelWithDebInfo >/dev/null
 cmake --build "$build" -j "$(nproc)" --target hyracli hyrasim tarnplugin bench_world host_bench \
-  >/dev/null
+  formatter_bench render_memory_probe >/dev/null
 bin=$PWD/$build/bin
 work=$PWD/$build/worlds
 rm -rf "$work" && mkdir -p "$work"
@@ -123,3 +123,12 @@ print(f"first load of 10,000 containers: median {figure('load')[2]:.2f} s (goal 
 print(f"peak memory of that load: {peak_kib / 1024:.1f} MiB for {output_bytes / 1e6:.1f} MB of output"
       f" ({peak_kib * 1024 / output_bytes:.1f}x)")
 PY
+echo
+echo "== formatters on a 10,000-container load result (in-process)"
+"$bin/formatter_bench" --benchmark_min_time=0.5
+for formatter in simple json; do
+  /usr/bin/time -f "%M" -o "$results/probe-$formatter.rss" \
+    "$bin/render_memory_probe" "$formatter" 10000 >"$results/probe-$formatter.out" 2>/dev/null
+  echo "render_memory_probe $formatter: peak $(($(cat "$results/probe-$formatter.rss") / 1024)) MiB" \
+    "for $(stat -c %s "$results/probe-$formatter.out") bytes of output"
+done
