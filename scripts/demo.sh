@@ -4,7 +4,7 @@
 # build/demo-world.db, and registers a new Kiro provider through hyracli.
 set -euo pipefail
 cd "$(dirname "$0")/.."
-scripts/install-deps.sh
+scripts/install-deps.sh --demo
 cmake --preset default >/dev/null
 cmake --build --preset default -j "$(nproc)" --target hyracli hyrasim tarnplugin
 export HYRA_SIM_DB="$PWD/build/demo-world.db"
