@@ -40,6 +40,12 @@ TarnRow TarnFrom(const Statement& row) {
   if (!row.IsNull(4)) t.unsharedSizeMB = row.Int(4);
   if (!row.IsNull(5)) t.storageProfile = row.Text(5);
   t.blockSize = row.Int(6);
+  // Held to the scenario's rule: a row edited by hand must not reach a
+  // division by a block size of zero or less.
+  if (t.blockSize < 1) {
+    throw WorldError("the tarn " + t.uuid + " of the world has block size " +
+                     std::to_string(t.blockSize) + ", and a block size is 1 or more");
+  }
   t.accessibility = static_cast<int32_t>(row.Int(7));
   if (!row.IsNull(8))
     t.configTarn = ConfigTarn{row.Text(8), row.Text(9), row.Text(10), row.Int(11) != 0};

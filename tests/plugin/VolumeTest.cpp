@@ -1,5 +1,7 @@
 // The virtualvolume commands against the simulated daemon: what each answers,
 // which failure ends it, and that records and the library are released.
+#include <sqlite3.h>
+
 #include "HostCtl/Lib.h"
 #include "PluginTestSupport.h"
 #include "TarnLibSim.h"
@@ -76,6 +78,24 @@ TEST_F(VolumeTest, CommandsAnswerOrReportTheirFirstFailure) {
   TarnLibSim_ResetCounters();
   EXPECT_THROW(RunCommand(*list, Volume(kGold, kTarn), RecordingOutput::ThrowOn::kResult),
                HostCtl::Lib::HostCtlException);
+  EXPECT_EQ(TarnLibSim_Openings(), 0);
+}
+
+// A row edited by hand behind the simulated host's back: a block size of 0
+// must end the command with its own text, not with a division by zero.
+TEST_F(VolumeTest, ABlockSizeOfZeroInTheWorldIsRefusedNotDividedBy) {
+  sqlite3* db = nullptr;
+  ASSERT_EQ(sqlite3_open((directory_ + "/world.db").c_str(), &db), SQLITE_OK);
+  const std::string edit =
+      std::string("UPDATE tarn SET block_size = 0 WHERE uuid = '") + kTarn + "'";
+  char* error = nullptr;
+  EXPECT_EQ(sqlite3_exec(db, edit.c_str(), nullptr, nullptr, &error), SQLITE_OK) << error;
+  sqlite3_free(error);
+  EXPECT_EQ(sqlite3_changes(db), 1);
+  sqlite3_close(db);
+
+  EXPECT_EQ(RunCommand(*VirtualVolumeGet::New(), Volume(kGold, kTarn)),
+            Calls{"error: Failed to get space stats for Tarn."});
   EXPECT_EQ(TarnLibSim_Openings(), 0);
 }
 
