@@ -99,7 +99,7 @@ std::vector<Stop> StopsOf(const boost::shared_ptr<Fendle::AutoCli::NamespaceNode
               {}, {}};
     if (boost::shared_ptr<Fendle::AutoCli::Command> command = AsCommand(node)) {
       stop.kind = Kind::Command;
-      // Held here: the parameters belong to the specification, which may be made per call.
+      // Held here: the parameters belong to the input declaration, which may be made per call.
       const boost::shared_ptr<Fendle::CallSpec::InputSpec> spec = command->GetInputSpec();
       for (const auto& parameter : spec->GetParameters()) {
         stop.options.push_back(

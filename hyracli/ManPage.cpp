@@ -221,7 +221,7 @@ void WriteToolManPage(const boost::shared_ptr<NamespaceNode>& root, const ManPag
 void WriteCommandManPage(Command& command, const ManPageInfo& info, std::ostream& page) {
   std::ostringstream out;
   const std::string name = ManPageName(command);
-  // Held here: the parameters belong to the specification, which may be made per call.
+  // Held here: the parameters belong to the input declaration, which may be made per call.
   boost::shared_ptr<Fendle::CallSpec::InputSpec> spec = command.GetInputSpec();
   const auto& parameters = spec->GetParameters();
 
